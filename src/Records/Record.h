@@ -1,0 +1,94 @@
+#pragma once
+// The common base of the record message classes. Each record knows its
+// class (a tag, cheaper than dynamic_cast in hot loops), its absolute time,
+// and whether it carries a wall time of its own.
+#include <cstdint>
+#include <memory>
+#include <optional>
+#include <string>
+
+#include "base/Value.h"
+
+namespace google::protobuf::io {
+class CodedInputStream;
+class CodedOutputStream;
+}  // namespace google::protobuf::io
+
+namespace bw {
+
+// One tag per message class. The order is not the stream's type numbers
+// (see the record reader's type table for those).
+enum class RecordClass : std::uint8_t {
+  LogStartsV0,
+  LogStartsV1,
+  BatteryChargeLevel,
+  PackageEnergyStatistics,
+  ProcessUsage,
+  PowerStateChange,
+  SleepWake,
+  TimeChange,
+  DateChange,
+  UserIdle,
+  DeviceChange,
+  Interrupts,
+  InterruptVector,
+  SystemMemory,
+  BluetoothPowerResidency,
+  SystemIO,
+  Cstates,
+  Cstate,
+  DisplayBrightness,
+  FanState,
+  SmcKeys,
+  SmcKey,
+  PanelSelfRefresh,
+};
+inline constexpr int kRecordClassCount = 23;
+
+// The class's name as printed ("SleepWake", "LogStartsV1", ...).
+const char* recordClassName(RecordClass c);
+
+class Record {
+ public:
+  virtual ~Record() = default;
+
+  RecordClass recordClass() const { return class_; }
+  const char* className() const { return recordClassName(class_); }
+
+  // The machine's absolute time of the record, in milliseconds of its boot.
+  virtual std::uint64_t absoluteTime() const = 0;
+  // Whether the class has a wall-time property at all (SleepWake,
+  // LogStartsV0/V1, PowerStateChange, DateChange, TimeChange).
+  virtual bool answersWallTime() const { return false; }
+  // The record's own wall time in milliseconds since 1970; 0 for none.
+  virtual std::uint64_t wallTime() const { return 0; }
+
+  // The one-line text; none for classes that have no such text.
+  virtual std::optional<std::string> prettyPrint() const { return std::nullopt; }
+  // Each present field under its dictionary key.
+  virtual Dictionary dictionaryRepresentation() const = 0;
+  // "ClassName <address> {dictionary}": the default description followed by
+  // the dictionary in the property-list text form.
+  std::string description() const;
+
+  // Decodes the message body; false on malformed or truncated input.
+  virtual bool readFrom(google::protobuf::io::CodedInputStream& input) = 0;
+  // Encodes the message body, fields in ascending number.
+  virtual void writeTo(google::protobuf::io::CodedOutputStream& output) const = 0;
+  // The encoded body as bytes.
+  std::string serialize() const;
+
+  virtual std::unique_ptr<Record> copy() const = 0;
+  virtual bool isEqual(const Record& other) const = 0;
+  virtual std::uint64_t hash() const = 0;
+
+ protected:
+  explicit Record(RecordClass c) : class_(c) {}
+  Record(const Record&) = default;
+  Record& operator=(const Record&) = default;
+
+ private:
+  RecordClass class_;
+};
+
+}  // namespace bw

@@ -1,0 +1,34 @@
+#pragma once
+// Finds the stats files a run reads: the local store (the program's own
+// directory, the service manager's, and the per-user directories under the
+// log directory) or everything below a `--from` directory.
+//
+// Files named "*.stats" are taken; those with "periodic" anywhere in the name
+// are rewritten all day, so they are taken only when modified strictly after
+// the options' cutoff. Paths come out once each, in ascending byte order, so
+// that every run reads and lists them the same way.
+#include <optional>
+#include <set>
+#include <string>
+
+#include "base/Date.h"
+#include "cli/Options.h"
+
+namespace bw {
+
+using FileList = std::set<std::string>;
+
+// The file list for a run. A `--from` directory without stats files ends the
+// run with "--from path contained no Brindlewick trace files." (status 66).
+FileList statsFileList(const Options& options);
+
+// Adds the matching files of `directory` to `files`. Recursive scans match
+// each entry's path relative to `directory` (files and directories alike); a
+// directory that cannot be listed adds nothing.
+void scanDirectory(FileList& files, const std::string& directory, bool recursive,
+                   const std::optional<Date>& cutoff);
+
+// The file's modification date, or none when its attributes cannot be read.
+std::optional<Date> modificationDate(const std::string& path);
+
+}  // namespace bw
