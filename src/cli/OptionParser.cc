@@ -67,8 +67,12 @@ std::uint64_t nowMilliseconds() {
 }
 
 // strtoul over exactly `len` characters starting at `s`; false unless the
-// number runs to the end of the field.
+// field is all digits (no sign, no blanks: "2024-1-1" would otherwise read
+// back as itself through negative fields).
 bool parseField(const char* s, std::size_t len, unsigned long& value) {
+  for (std::size_t i = 0; i < len; ++i) {
+    if (s[i] < '0' || s[i] > '9') return false;
+  }
   char buf[8] = {};
   std::memcpy(buf, s, len);
   char* end = nullptr;

@@ -1,0 +1,93 @@
+#include <gtest/gtest.h>
+
+#include "base/Date.h"
+#include "base/Duration.h"
+#include "base/Range.h"
+#include "base/Uuid.h"
+#include "base/Value.h"
+
+namespace bw {
+namespace {
+
+TEST(ValueText, NestedDictionaryAndArrayIndentFourSpacesPerLevel) {
+  Dictionary inner{{"level", Value(std::uint64_t{1})}, {"residency", Value(std::uint64_t{250})}};
+  Dictionary outer{{"absolute_time", Value(std::uint64_t{5})},
+                   {"states", Value(Array{Value(inner), Value(inner)})}};
+  EXPECT_EQ(describeValue(Value(outer)),
+            "{\n"
+            "    absolute_time = 5;\n"
+            "    states = (\n"
+            "        {\n"
+            "            level = 1;\n"
+            "            residency = 250;\n"
+            "        },\n"
+            "        {\n"
+            "            level = 1;\n"
+            "            residency = 250;\n"
+            "        }\n"
+            "    );\n"
+            "}");
+}
+
+TEST(ValueText, StringsAreQuotedOnlyWhenTheyHoldOtherCharacters) {
+  EXPECT_EQ(describeValue(Value("abc_$./:-09")), "abc_$./:-09");
+  EXPECT_EQ(describeValue(Value("two words")), "\"two words\"");
+  EXPECT_EQ(describeValue(Value("")), "\"\"");
+  EXPECT_EQ(describeValue(Value("say \"hi\"\n")), "\"say \\\"hi\\\"\\n\"");
+}
+
+TEST(ValueText, NumbersPrintTheirShortestText) {
+  EXPECT_EQ(describeValue(Value(true)), "1");
+  EXPECT_EQ(describeValue(Value(false)), "0");
+  EXPECT_EQ(describeValue(Value(std::int64_t{-42})), "-42");
+  EXPECT_EQ(describeValue(Value(~std::uint64_t{0})), "18446744073709551615");
+  EXPECT_EQ(describeValue(Value(3.0)), "3");
+  EXPECT_EQ(describeValue(Value(0.1)), "0.1");
+}
+
+TEST(ValueText, DataPrintsHexInGroupsOfFourBytes) {
+  Data d{0x01, 0x02, 0x03, 0x04, 0xab, 0xcd};
+  EXPECT_EQ(describeValue(Value(d)), "<01020304 abcd>");
+  EXPECT_EQ(describeValue(Value(Data{})), "<>");
+}
+
+TEST(ValueText, DatesPrintInUtcAndTheDistantPastAsYearOne) {
+  EXPECT_EQ(describeDate(Date{0}), "1970-01-01 00:00:00 +0000");
+  EXPECT_EQ(describeDate(Date{1704164645.9}), "2024-01-02 03:04:05 +0000");
+  EXPECT_EQ(describeDate(Date::distantPast()), "0001-01-01 00:00:00 +0000");
+}
+
+TEST(Uuid, ParsesEitherCaseAndPrintsUpperCase) {
+  auto u = Uuid::parse("0123abcd-4567-89ef-0123-456789ABCDEF");
+  ASSERT_TRUE(u);
+  EXPECT_EQ(u->string(), "0123ABCD-4567-89EF-0123-456789ABCDEF");
+  EXPECT_EQ(u->bytes()[0], 0x01);
+  EXPECT_EQ(u->bytes()[15], 0xEF);
+  EXPECT_EQ(Uuid::parse(u->string()), u);
+}
+
+TEST(Uuid, RefusesMalformedText) {
+  for (const char* bad : {"", "0123abcd4567-89ef-0123-456789abcdef0", "0123abcd-4567-89ef-0123-456789abcdeg",
+                          "0123abcd-4567-89ef-0123-456789abcde", "{0123abcd-4567-89ef-0123-456789abcde}"}) {
+    EXPECT_FALSE(Uuid::parse(bad)) << bad;
+  }
+}
+
+TEST(Duration, HoursAreNotLimitedToTwoDigits) {
+  EXPECT_EQ(durationText(3722000), "01:02:02");
+  EXPECT_EQ(durationText(0), "00:00:00");
+  EXPECT_EQ(durationText(999), "00:00:00");
+  EXPECT_EQ(durationText(100LL * 3600000 + 59999), "100:00:59");
+}
+
+TEST(Range, TouchingRangesIntersectInAnEmptyRangeAtTheTouchingPoint) {
+  EXPECT_EQ(intersectionRange({10, 10}, {20, 5}), (Range{20, 0}));
+  EXPECT_EQ(intersectionRange({10, 10}, {21, 5}), (Range{0, 0}));
+  EXPECT_EQ(intersectionRange({10, 10}, {15, 20}), (Range{15, 5}));
+  EXPECT_EQ(intersectionRange({15, 20}, {10, 10}), (Range{15, 5}));
+  EXPECT_TRUE(Range({10, 5}).contains(10));
+  EXPECT_FALSE(Range({10, 5}).contains(15));
+}
+
+}  // namespace
+}  // namespace bw
