@@ -4,6 +4,7 @@
 #include <google/protobuf/io/zero_copy_stream_impl_lite.h>
 
 #include "base/Console.h"
+#include "base/Exception.h"
 
 namespace bw {
 
@@ -31,5 +32,7 @@ std::string Record::serialize() const {
   }
   return bytes;
 }
+
+void Record::copyTo(Record&) const { terminateUnsupported("Record::copyTo"); }
 
 }  // namespace bw

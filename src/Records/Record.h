@@ -2,6 +2,7 @@
 // The common base of the record message classes. Each record knows its
 // class (a tag, cheaper than dynamic_cast in hot loops), its absolute time,
 // and whether it carries a wall time of its own.
+#include <cstddef>
 #include <cstdint>
 #include <memory>
 #include <optional>
@@ -77,7 +78,18 @@ class Record {
   virtual void writeTo(google::protobuf::io::CodedOutputStream& output) const = 0;
   // The encoded body as bytes.
   std::string serialize() const;
+  // The length of the encoded body, as writeTo produces it. The record
+  // classes compute it without encoding; the default encodes.
+  virtual std::size_t byteSize() const { return serialize().size(); }
 
+  // Copies into `target`, which must be of the same class (else an
+  // NSInvalidArgumentException): required scalars always, every other field
+  // only when present here, repeated fields only when they have elements
+  // (they then replace the target's). Fields absent here keep the target's.
+  // Classes other than the record classes do not support it (abort).
+  virtual void copyTo(Record& target) const;
+
+  // A new record with every field (and every override) duplicated.
   virtual std::unique_ptr<Record> copy() const = 0;
   virtual bool isEqual(const Record& other) const = 0;
   virtual std::uint64_t hash() const = 0;
@@ -90,5 +102,14 @@ class Record {
  private:
   RecordClass class_;
 };
+
+// The record as its class `T` when its tag says so, else null. Cheaper than
+// dynamic_cast; every record class has a `kClass` tag.
+template <class T> T* recordCast(Record* r) {
+  return r != nullptr && r->recordClass() == T::kClass ? static_cast<T*>(r) : nullptr;
+}
+template <class T> const T* recordCast(const Record* r) {
+  return r != nullptr && r->recordClass() == T::kClass ? static_cast<const T*>(r) : nullptr;
+}
 
 }  // namespace bw

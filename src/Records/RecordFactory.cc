@@ -1,0 +1,77 @@
+#include "Records/RecordFactory.h"
+
+#include <iterator>
+#include <new>
+
+#include "Records/BatteryChargeLevel.h"
+#include "Records/BluetoothPowerResidency.h"
+#include "Records/Cstates.h"
+#include "Records/DateChange.h"
+#include "Records/DeviceChange.h"
+#include "Records/DisplayBrightness.h"
+#include "Records/FanState.h"
+#include "Records/Interrupts.h"
+#include "Records/LogStartsV0.h"
+#include "Records/LogStartsV1.h"
+#include "Records/PackageEnergyStatistics.h"
+#include "Records/PanelSelfRefresh.h"
+#include "Records/PowerStateChange.h"
+#include "Records/ProcessUsage.h"
+#include "Records/SleepWake.h"
+#include "Records/SmcKeys.h"
+#include "Records/SystemIO.h"
+#include "Records/SystemMemory.h"
+#include "Records/TimeChange.h"
+#include "Records/UserIdle.h"
+
+namespace bw {
+
+namespace {
+
+struct ClassEntry {
+  RecordClass recordClass;
+  RecordLayout layout;
+  Record* (*construct)(void* storage);
+  std::unique_ptr<Record> (*make)();
+  const RecordSchema& (*schema)();
+};
+
+template <class T> constexpr ClassEntry entry() {
+  return ClassEntry{T::kClass, RecordLayout{sizeof(T), alignof(T)},
+                    [](void* storage) -> Record* { return new (storage) T(); },
+                    []() -> std::unique_ptr<Record> { return std::make_unique<T>(); }, &T::schema};
+}
+
+// In RecordClass order.
+constexpr ClassEntry kClasses[] = {
+    entry<LogStartsV0>(),      entry<LogStartsV1>(),      entry<BatteryChargeLevel>(),
+    entry<PackageEnergyStatistics>(), entry<ProcessUsage>(), entry<PowerStateChange>(),
+    entry<SleepWake>(),        entry<TimeChange>(),       entry<DateChange>(),
+    entry<UserIdle>(),         entry<DeviceChange>(),     entry<Interrupts>(),
+    entry<InterruptVector>(),  entry<SystemMemory>(),     entry<BluetoothPowerResidency>(),
+    entry<SystemIO>(),         entry<Cstates>(),          entry<Cstate>(),
+    entry<DisplayBrightness>(), entry<FanState>(),        entry<SmcKeys>(),
+    entry<SmcKey>(),           entry<PanelSelfRefresh>(),
+};
+static_assert(std::size(kClasses) == kRecordClassCount);
+
+constexpr bool inTagOrder() {
+  for (std::size_t i = 0; i < std::size(kClasses); ++i)
+    if (static_cast<std::size_t>(kClasses[i].recordClass) != i) return false;
+  return true;
+}
+static_assert(inTagOrder(), "the table must follow RecordClass");
+
+const ClassEntry& entryOf(RecordClass c) { return kClasses[static_cast<std::size_t>(c)]; }
+
+}  // namespace
+
+std::unique_ptr<Record> makeRecord(RecordClass c) { return entryOf(c).make(); }
+
+RecordLayout recordLayout(RecordClass c) { return entryOf(c).layout; }
+
+Record* constructRecord(RecordClass c, void* storage) { return entryOf(c).construct(storage); }
+
+const RecordSchema& recordSchema(RecordClass c) { return entryOf(c).schema(); }
+
+}  // namespace bw
