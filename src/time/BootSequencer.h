@@ -1,0 +1,37 @@
+#pragma once
+// Chains the boots of a run by their previous-boot UUIDs, one chain per
+// system version, and makes each kept chain one timeline of boots, oldest
+// first.
+//
+// Of all chains of a version, the kept one ends with the boot that ends
+// latest in wall time (on a tie the longer chain, then the one whose last
+// boot has the lower UUID). Boots left out are listed on standard output
+// after "Warning: could not sequence some boots:", one "\t<UUID>" line
+// each, and take no further part.
+#include <map>
+#include <memory>
+#include <string>
+#include <unordered_map>
+#include <vector>
+
+#include "base/Uuid.h"
+#include "time/Timeline.h"
+
+namespace bw {
+
+// The record reader's result: each boot's records as non-owning pointers
+// (the records live in the reader's pool until the models are built).
+using BootRecords = std::unordered_map<Uuid, std::vector<Record*>>;
+
+// Sorts each boot's records by absolute time in place (ties keep their
+// order), builds its BootTimeline and returns the kept chain of each system
+// version (a boot's first record without one files it under "<unknown>").
+// Throws "invalid event stream detected" for a boot whose first record is
+// not a LogStartsV1, and kInternalInconsistencyException "boot uuid cycle
+// detected" when previous-boot links loop.
+std::map<std::string, std::unique_ptr<Timeline>> sequenceBoots(BootRecords& bootRecords);
+
+// Sorts records by absolute time; records with equal times keep their order.
+void sortByAbsoluteTime(std::vector<Record*>& records);
+
+}  // namespace bw
