@@ -60,8 +60,15 @@ inline bool atEnd(CodedInputStream& in) {
   return !in.GetDirectBufferPointer(&data, &size);
 }
 
+// Skips one field's value by the key's wire type. The library refuses field
+// number 0 (also what a key wider than 32 bits may truncate to), which
+// records skip like any other unknown field.
 inline bool skipField(CodedInputStream& in, std::uint64_t key) {
-  return WFL::SkipField(&in, static_cast<std::uint32_t>(key));
+  const std::uint32_t tag = static_cast<std::uint32_t>(key);
+  if (WFL::GetTagFieldNumber(tag) != 0) return WFL::SkipField(&in, tag);
+  const WFL::WireType type = WFL::GetTagWireType(tag);
+  if (type != WFL::WIRETYPE_START_GROUP) return WFL::SkipField(&in, WFL::MakeTag(1, type));
+  return WFL::SkipMessage(&in) && in.LastTagWas(WFL::MakeTag(0, WFL::WIRETYPE_END_GROUP));
 }
 
 template <FieldKind K> struct Codec;
@@ -147,6 +154,10 @@ constexpr bool alwaysPresent(FieldKind k, Presence p) { return p == Presence::Re
 template <class E> bool readElement(CodedInputStream& in, std::vector<E>& elements) {
   int length;
   if (!in.ReadVarintSizeAsInt(&length)) return false;
+  // A limit cannot reach past the one around it: an element longer than
+  // what is left is cut short.
+  int available = in.BytesUntilLimit();
+  if (available >= 0 && length > available) return false;
   CodedInputStream::Limit limit = in.PushLimit(length);
   if (!elements.emplace_back().readFrom(in)) return false;
   int rest = in.BytesUntilLimit();
