@@ -215,12 +215,12 @@ template <std::size_t n> constexpr bool strictlyAscending(const FieldInfo (&fiel
 #define BW_CODEC_ALWAYS(kind, presence) \
   ::bw::record_codec::alwaysPresent(BW_CODEC_KIND(kind), ::bw::record_codec::Presence::presence)
 #define BW_CODEC_PRESENT(self, name, kind, presence) \
-  (BW_CODEC_ALWAYS(kind, presence) || ((self).has_ & bit(kBit_##name)) != 0)
+  (BW_CODEC_ALWAYS(kind, presence) || (self).hasBit(kBit_##name))
 
 #define BW_CODEC_READ_CASE(name, Name, number, kind, presence, key)  \
   case number:                                                       \
     if (!BW_CODEC_OF(kind)::read(input, &name##_)) return false;     \
-    has_ |= bit(kBit_##name);                                        \
+    setBit(kBit_##name);                                             \
     break;
 #define BW_CODEC_READ_REPEATED_CASE(name, Name, number, Element, key)           \
   case number:                                                                  \
@@ -229,7 +229,7 @@ template <std::size_t n> constexpr bool strictlyAscending(const FieldInfo (&fiel
 
 #define BW_CODEC_WRITE(name, Name, number, kind, presence, key)                                  \
   if constexpr (BW_CODEC_REQUIRED(presence) && ::bw::record_codec::isObject(BW_CODEC_KIND(kind))) {      \
-    if ((has_ & bit(kBit_##name)) == 0)                                                          \
+    if (!hasBit(kBit_##name))                                                                    \
       ::bw::record_codec::requiredFieldMissing("nil != self->_" #name, kAssertionSource);        \
   }                                                                                              \
   if (BW_CODEC_PRESENT(*this, name, kind, presence)) BW_CODEC_OF(kind)::write(number, name##_, output);
@@ -254,13 +254,13 @@ template <std::size_t n> constexpr bool strictlyAscending(const FieldInfo (&fiel
   if (BW_CODEC_PRESENT(*this, name, kind, presence)) h ^= BW_CODEC_OF(kind)::hash(name##_);
 #define BW_CODEC_HASH_REPEATED(name, Name, number, Element, key) h ^= ::bw::record_codec::elementsHash(name##_);
 
-#define BW_CODEC_COPY_TO(name, Name, number, kind, presence, key)                             \
-  if (BW_CODEC_ALWAYS(kind, presence)) {                                                      \
-    t.name##_ = name##_;                                                                      \
-    t.has_ = HasBits((t.has_ & ~bit(kBit_##name)) | (has_ & bit(kBit_##name)));               \
-  } else if ((has_ & bit(kBit_##name)) != 0) {                                                \
-    t.name##_ = name##_;                                                                      \
-    t.has_ |= bit(kBit_##name);                                                               \
+#define BW_CODEC_COPY_TO(name, Name, number, kind, presence, key) \
+  if (BW_CODEC_ALWAYS(kind, presence)) {                         \
+    t.name##_ = name##_;                                         \
+    t.putBit(kBit_##name, hasBit(kBit_##name));                  \
+  } else if (hasBit(kBit_##name)) {                              \
+    t.name##_ = name##_;                                         \
+    t.setBit(kBit_##name);                                       \
   }
 #define BW_CODEC_COPY_TO_REPEATED(name, Name, number, Element, key) \
   if (!name##_.empty() && &t != this) t.name##_ = name##_;

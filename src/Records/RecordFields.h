@@ -25,13 +25,12 @@
 // dictionary; its has-flag only tells whether a value was set or read.
 // Byte buffers are std::string (a 16-byte UUID stays inside the object).
 //
-// Storage is compact: has-flags packed in the smallest unsigned integer that
-// holds them, scalars as plain members grouped by size, no heap allocation
+// Storage is compact: has-flags packed as bits, scalars as plain members
+// grouped by size, no heap allocation
 // beyond long strings and repeated elements. Records hold nothing that ties
 // them to where they live, so they can be placement-constructed in bulk.
 #include <cstdint>
 #include <string>
-#include <type_traits>
 #include <utility>
 #include <vector>
 
@@ -42,16 +41,6 @@ namespace google::protobuf::io {
 class CodedInputStream;
 class CodedOutputStream;
 }  // namespace google::protobuf::io
-
-namespace bw::record_fields {
-
-// The smallest unsigned integer with `n` bits.
-template <unsigned n>
-using HasBitsFor = std::conditional_t<
-    (n <= 8), std::uint8_t,
-    std::conditional_t<(n <= 16), std::uint16_t, std::conditional_t<(n <= 32), std::uint32_t, std::uint64_t>>>;
-
-}  // namespace bw::record_fields
 
 // ---- small preprocessor helpers ----
 #define BW_PP_CAT(a, b) BW_PP_CAT_I(a, b)
@@ -120,27 +109,25 @@ using HasBitsFor = std::conditional_t<
 #define BW_FIELD_BIT_ENUM(name, Name, number, kind, presence, key) kBit_##name,
 
 // ---- accessors ----
-#define BW_FIELD_SCALAR_ACCESSORS(type, name, Name)                                     \
-  type name() const BW_FIELD_OVERRIDE_IF(name) { return name##_; }                      \
-  void set##Name(type value) {                                                          \
-    name##_ = value;                                                                    \
-    has_ |= bit(kBit_##name);                                                           \
-  }                                                                                     \
-  bool has##Name() const { return (has_ & bit(kBit_##name)) != 0; }                     \
-  void setHas##Name(bool present) {                                                     \
-    has_ = present ? HasBits(has_ | bit(kBit_##name)) : HasBits(has_ & ~bit(kBit_##name)); \
-  }
+#define BW_FIELD_SCALAR_ACCESSORS(type, name, Name)                \
+  type name() const BW_FIELD_OVERRIDE_IF(name) { return name##_; } \
+  void set##Name(type value) {                                     \
+    name##_ = value;                                               \
+    setBit(kBit_##name);                                           \
+  }                                                                \
+  bool has##Name() const { return hasBit(kBit_##name); }           \
+  void setHas##Name(bool present) { putBit(kBit_##name, present); }
 
-#define BW_FIELD_OBJECT_ACCESSORS(name, Name)                               \
-  const std::string& name() const { return name##_; }                      \
-  void set##Name(std::string value) {                                      \
-    name##_ = std::move(value);                                            \
-    has_ |= bit(kBit_##name);                                              \
-  }                                                                        \
-  bool has##Name() const { return (has_ & bit(kBit_##name)) != 0; }        \
-  void clear##Name() {                                                     \
-    std::string().swap(name##_);                                           \
-    has_ = HasBits(has_ & ~bit(kBit_##name));                              \
+#define BW_FIELD_OBJECT_ACCESSORS(name, Name)                  \
+  const std::string& name() const { return name##_; }         \
+  void set##Name(std::string value) {                         \
+    name##_ = std::move(value);                               \
+    setBit(kBit_##name);                                      \
+  }                                                           \
+  bool has##Name() const { return hasBit(kBit_##name); }      \
+  void clear##Name() {                                        \
+    std::string().swap(name##_);                              \
+    putBit(kBit_##name, false);                               \
   }
 
 #define BW_FIELD_ACCESSORS_UInt64(name, Name) BW_FIELD_SCALAR_ACCESSORS(std::uint64_t, name, Name)
@@ -181,14 +168,19 @@ using HasBitsFor = std::conditional_t<
   std::uint64_t hash() const override;                                               \
   static const ::bw::RecordSchema& schema();
 
-// The private part: has-flags and members.
-#define BW_RECORD_STORAGE(FIELDS, REPEATED)                                      \
-  enum : unsigned { FIELDS(BW_FIELD_BIT_ENUM) kFieldCount };                      \
-  using HasBits = ::bw::record_fields::HasBitsFor<kFieldCount>;                   \
-  static constexpr HasBits bit(unsigned index) { return HasBits(HasBits(1) << index); } \
-  HasBits has_{};                                                                 \
-  FIELDS(BW_FIELD_MEMBER_ONE)                                                     \
-  FIELDS(BW_FIELD_MEMBER_FOUR)                                                    \
-  FIELDS(BW_FIELD_MEMBER_EIGHT)                                                   \
-  FIELDS(BW_FIELD_MEMBER_OBJECT)                                                  \
+// The private part: has-flags and members. The has-flags are bytes so that
+// they, like the one-byte and four-byte fields, can sit in the base's
+// padding right after its class tag.
+#define BW_RECORD_STORAGE(FIELDS, REPEATED)                                                  \
+  enum : unsigned { FIELDS(BW_FIELD_BIT_ENUM) kFieldCount };                                  \
+  bool hasBit(unsigned i) const { return ((has_[i >> 3] >> (i & 7)) & 1u) != 0; }              \
+  void setBit(unsigned i) { has_[i >> 3] = std::uint8_t(has_[i >> 3] | (1u << (i & 7))); }    \
+  void putBit(unsigned i, bool on) {                                                          \
+    has_[i >> 3] = std::uint8_t(on ? has_[i >> 3] | (1u << (i & 7)) : has_[i >> 3] & ~(1u << (i & 7))); \
+  }                                                                                           \
+  std::uint8_t has_[(kFieldCount + 7) / 8] = {};                                              \
+  FIELDS(BW_FIELD_MEMBER_ONE)                                                                 \
+  FIELDS(BW_FIELD_MEMBER_FOUR)                                                                \
+  FIELDS(BW_FIELD_MEMBER_EIGHT)                                                               \
+  FIELDS(BW_FIELD_MEMBER_OBJECT)                                                              \
   REPEATED(BW_FIELD_REPEATED_MEMBER)
