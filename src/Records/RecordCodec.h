@@ -71,47 +71,65 @@ inline bool skipField(CodedInputStream& in, std::uint64_t key) {
   return WFL::SkipMessage(&in) && in.LastTagWas(WFL::MakeTag(0, WFL::WIRETYPE_END_GROUP));
 }
 
-template <FieldKind K> struct Codec;
+template <FieldKind K>
+struct Codec;
 
-template <class T, WFL::FieldType kType> struct VarintCodec {
+template <class T, WFL::FieldType kType>
+struct VarintCodec {
   using Type = T;
   static bool read(CodedInputStream& in, T* v) { return WFL::ReadPrimitive<T, kType>(&in, v); }
   static std::uint64_t hash(T v) { return static_cast<std::uint64_t>(v) * kHashMultiplier; }
 };
 
-template <> struct Codec<FieldKind::UInt64> : VarintCodec<std::uint64_t, WFL::TYPE_UINT64> {
+template <>
+struct Codec<FieldKind::UInt64> : VarintCodec<std::uint64_t, WFL::TYPE_UINT64> {
   static void write(int n, std::uint64_t v, CodedOutputStream& out) { WFL::WriteUInt64(n, v, &out); }
-  static std::size_t size(int n, std::uint64_t v) { return WFL::TagSize(n, WFL::TYPE_UINT64) + WFL::UInt64Size(v); }
+  static std::size_t size(int n, std::uint64_t v) {
+    return WFL::TagSize(n, WFL::TYPE_UINT64) + WFL::UInt64Size(v);
+  }
   static Value value(std::uint64_t v) { return Value(static_cast<unsigned long long>(v)); }
   static std::uint64_t from(const Value& v) { return v.uint64Value(); }
 };
-template <> struct Codec<FieldKind::SInt64> : VarintCodec<std::int64_t, WFL::TYPE_SINT64> {
+template <>
+struct Codec<FieldKind::SInt64> : VarintCodec<std::int64_t, WFL::TYPE_SINT64> {
   static void write(int n, std::int64_t v, CodedOutputStream& out) { WFL::WriteSInt64(n, v, &out); }
-  static std::size_t size(int n, std::int64_t v) { return WFL::TagSize(n, WFL::TYPE_SINT64) + WFL::SInt64Size(v); }
+  static std::size_t size(int n, std::int64_t v) {
+    return WFL::TagSize(n, WFL::TYPE_SINT64) + WFL::SInt64Size(v);
+  }
   static Value value(std::int64_t v) { return Value(static_cast<long long>(v)); }
   static std::int64_t from(const Value& v) { return v.int64Value(); }
 };
-template <> struct Codec<FieldKind::UInt32> : VarintCodec<std::uint32_t, WFL::TYPE_UINT32> {
+template <>
+struct Codec<FieldKind::UInt32> : VarintCodec<std::uint32_t, WFL::TYPE_UINT32> {
   static void write(int n, std::uint32_t v, CodedOutputStream& out) { WFL::WriteUInt32(n, v, &out); }
-  static std::size_t size(int n, std::uint32_t v) { return WFL::TagSize(n, WFL::TYPE_UINT32) + WFL::UInt32Size(v); }
+  static std::size_t size(int n, std::uint32_t v) {
+    return WFL::TagSize(n, WFL::TYPE_UINT32) + WFL::UInt32Size(v);
+  }
   static Value value(std::uint32_t v) { return Value(static_cast<unsigned long long>(v)); }
   static std::uint32_t from(const Value& v) { return static_cast<std::uint32_t>(v.uint64Value()); }
 };
-template <> struct Codec<FieldKind::Int32> : VarintCodec<std::int32_t, WFL::TYPE_INT32> {
+template <>
+struct Codec<FieldKind::Int32> : VarintCodec<std::int32_t, WFL::TYPE_INT32> {
   static void write(int n, std::int32_t v, CodedOutputStream& out) { WFL::WriteInt32(n, v, &out); }
-  static std::size_t size(int n, std::int32_t v) { return WFL::TagSize(n, WFL::TYPE_INT32) + WFL::Int32Size(v); }
+  static std::size_t size(int n, std::int32_t v) {
+    return WFL::TagSize(n, WFL::TYPE_INT32) + WFL::Int32Size(v);
+  }
   static Value value(std::int32_t v) { return Value(static_cast<long long>(v)); }
   static std::int32_t from(const Value& v) { return static_cast<std::int32_t>(v.int64Value()); }
 };
-template <> struct Codec<FieldKind::Bool> : VarintCodec<bool, WFL::TYPE_BOOL> {
+template <>
+struct Codec<FieldKind::Bool> : VarintCodec<bool, WFL::TYPE_BOOL> {
   static void write(int n, bool v, CodedOutputStream& out) { WFL::WriteBool(n, v, &out); }
   static std::size_t size(int n, bool) { return WFL::TagSize(n, WFL::TYPE_BOOL) + WFL::kBoolSize; }
   static Value value(bool v) { return Value(v); }
   static bool from(const Value& v) { return v.int64Value() != 0; }
 };
-template <> struct Codec<FieldKind::Double> {
+template <>
+struct Codec<FieldKind::Double> {
   using Type = double;
-  static bool read(CodedInputStream& in, double* v) { return WFL::ReadPrimitive<double, WFL::TYPE_DOUBLE>(&in, v); }
+  static bool read(CodedInputStream& in, double* v) {
+    return WFL::ReadPrimitive<double, WFL::TYPE_DOUBLE>(&in, v);
+  }
   static void write(int n, double v, CodedOutputStream& out) { WFL::WriteDouble(n, v, &out); }
   static std::size_t size(int n, double) { return WFL::TagSize(n, WFL::TYPE_DOUBLE) + WFL::kDoubleSize; }
   static Value value(double v) { return Value(v); }
@@ -121,7 +139,8 @@ template <> struct Codec<FieldKind::Double> {
 
 std::string stringFromValue(const Value& v);
 
-template <> struct Codec<FieldKind::String> {
+template <>
+struct Codec<FieldKind::String> {
   using Type = std::string;
   static bool read(CodedInputStream& in, std::string* v) { return WFL::ReadString(&in, v); }
   static void write(int n, const std::string& v, CodedOutputStream& out) { WFL::WriteString(n, v, &out); }
@@ -132,11 +151,14 @@ template <> struct Codec<FieldKind::String> {
   static std::string from(const Value& v) { return stringFromValue(v); }
   static std::uint64_t hash(const std::string& v) { return hashBytes(v); }
 };
-template <> struct Codec<FieldKind::Bytes> {
+template <>
+struct Codec<FieldKind::Bytes> {
   using Type = std::string;
   static bool read(CodedInputStream& in, std::string* v) { return WFL::ReadBytes(&in, v); }
   static void write(int n, const std::string& v, CodedOutputStream& out) { WFL::WriteBytes(n, v, &out); }
-  static std::size_t size(int n, const std::string& v) { return WFL::TagSize(n, WFL::TYPE_BYTES) + WFL::BytesSize(v); }
+  static std::size_t size(int n, const std::string& v) {
+    return WFL::TagSize(n, WFL::TYPE_BYTES) + WFL::BytesSize(v);
+  }
   static Value value(const std::string& v) { return Value(Data(v.begin(), v.end())); }
   static std::string from(const Value& v) { return stringFromValue(v); }
   static std::uint64_t hash(const std::string& v) { return hashBytes(v); }
@@ -151,7 +173,8 @@ constexpr bool alwaysPresent(FieldKind k, Presence p) { return p == Presence::Re
 
 // Reads one length-delimited element and appends it. An element that stops
 // early (at an end-group key) has the rest of its bytes skipped.
-template <class E> bool readElement(CodedInputStream& in, std::vector<E>& elements) {
+template <class E>
+bool readElement(CodedInputStream& in, std::vector<E>& elements) {
   int length;
   if (!in.ReadVarintSizeAsInt(&length)) return false;
   // A limit cannot reach past the one around it: an element longer than
@@ -166,7 +189,8 @@ template <class E> bool readElement(CodedInputStream& in, std::vector<E>& elemen
   return true;
 }
 
-template <class E> void writeElements(int n, const std::vector<E>& elements, CodedOutputStream& out) {
+template <class E>
+void writeElements(int n, const std::vector<E>& elements, CodedOutputStream& out) {
   for (const E& e : elements) {
     WFL::WriteTag(n, WFL::WIRETYPE_LENGTH_DELIMITED, &out);
     out.WriteVarint32(static_cast<std::uint32_t>(e.byteSize()));
@@ -174,24 +198,30 @@ template <class E> void writeElements(int n, const std::vector<E>& elements, Cod
   }
 }
 
-template <class E> std::size_t elementsSize(int n, const std::vector<E>& elements) {
+template <class E>
+std::size_t elementsSize(int n, const std::vector<E>& elements) {
   std::size_t total = 0;
-  for (const E& e : elements) total += WFL::TagSize(n, WFL::TYPE_MESSAGE) + WFL::LengthDelimitedSize(e.byteSize());
+  for (const E& e : elements)
+    total += WFL::TagSize(n, WFL::TYPE_MESSAGE) + WFL::LengthDelimitedSize(e.byteSize());
   return total;
 }
 
-template <class E> bool elementsEqual(const std::vector<E>& a, const std::vector<E>& b) {
-  return std::equal(a.begin(), a.end(), b.begin(), b.end(), [](const E& x, const E& y) { return x.isEqual(y); });
+template <class E>
+bool elementsEqual(const std::vector<E>& a, const std::vector<E>& b) {
+  return std::equal(a.begin(), a.end(), b.begin(), b.end(),
+                    [](const E& x, const E& y) { return x.isEqual(y); });
 }
 
 // Order-sensitive combination of the elements' hashes; 0 for no elements.
-template <class E> std::uint64_t elementsHash(const std::vector<E>& elements) {
+template <class E>
+std::uint64_t elementsHash(const std::vector<E>& elements) {
   std::uint64_t h = 0;
   for (const E& e : elements) h = h * 31 + e.hash();
   return h;
 }
 
-template <class E> Value elementsValue(const std::vector<E>& elements) {
+template <class E>
+Value elementsValue(const std::vector<E>& elements) {
   if (elements.empty()) return Value();
   Array array;
   array.reserve(elements.size());
@@ -200,7 +230,8 @@ template <class E> Value elementsValue(const std::vector<E>& elements) {
 }
 
 // Whether the numbers strictly ascend, which writeTo's field order relies on.
-template <std::size_t n> constexpr bool strictlyAscending(const FieldInfo (&fields)[n]) {
+template <std::size_t n>
+constexpr bool strictlyAscending(const FieldInfo (&fields)[n]) {
   for (std::size_t i = 1; i < n; ++i)
     if (fields[i - 1].number >= fields[i].number) return false;
   return true;
@@ -217,21 +248,21 @@ template <std::size_t n> constexpr bool strictlyAscending(const FieldInfo (&fiel
 #define BW_CODEC_PRESENT(self, name, kind, presence) \
   (BW_CODEC_ALWAYS(kind, presence) || (self).hasBit(kBit_##name))
 
-#define BW_CODEC_READ_CASE(name, Name, number, kind, presence, key)  \
-  case number:                                                       \
-    if (!BW_CODEC_OF(kind)::read(input, &name##_)) return false;     \
-    setBit(kBit_##name);                                             \
+#define BW_CODEC_READ_CASE(name, Name, number, kind, presence, key) \
+  case number:                                                      \
+    if (!BW_CODEC_OF(kind)::read(input, &name##_)) return false;    \
+    setBit(kBit_##name);                                            \
     break;
-#define BW_CODEC_READ_REPEATED_CASE(name, Name, number, Element, key)           \
-  case number:                                                                  \
-    if (!::bw::record_codec::readElement(input, name##_)) return false;         \
+#define BW_CODEC_READ_REPEATED_CASE(name, Name, number, Element, key)   \
+  case number:                                                          \
+    if (!::bw::record_codec::readElement(input, name##_)) return false; \
     break;
 
-#define BW_CODEC_WRITE(name, Name, number, kind, presence, key)                                  \
-  if constexpr (BW_CODEC_REQUIRED(presence) && ::bw::record_codec::isObject(BW_CODEC_KIND(kind))) {      \
-    if (!hasBit(kBit_##name))                                                                    \
-      ::bw::record_codec::requiredFieldMissing("nil != self->_" #name, kAssertionSource);        \
-  }                                                                                              \
+#define BW_CODEC_WRITE(name, Name, number, kind, presence, key)                                     \
+  if constexpr (BW_CODEC_REQUIRED(presence) && ::bw::record_codec::isObject(BW_CODEC_KIND(kind))) { \
+    if (!hasBit(kBit_##name))                                                                       \
+      ::bw::record_codec::requiredFieldMissing("nil != self->_" #name, kAssertionSource);           \
+  }                                                                                                 \
   if (BW_CODEC_PRESENT(*this, name, kind, presence)) BW_CODEC_OF(kind)::write(number, name##_, output);
 #define BW_CODEC_WRITE_REPEATED(name, Name, number, Element, key) \
   ::bw::record_codec::writeElements(number, name##_, output);
@@ -241,122 +272,124 @@ template <std::size_t n> constexpr bool strictlyAscending(const FieldInfo (&fiel
 #define BW_CODEC_SIZE_REPEATED(name, Name, number, Element, key) \
   total += ::bw::record_codec::elementsSize(number, name##_);
 
-#define BW_CODEC_EQUAL(name, Name, number, kind, presence, key)                                \
-  {                                                                                            \
-    bool mine = BW_CODEC_PRESENT(*this, name, kind, presence);                                 \
-    if (mine != BW_CODEC_PRESENT(o, name, kind, presence)) return false;                       \
-    if (mine && !(name##_ == o.name##_)) return false;                                         \
+#define BW_CODEC_EQUAL(name, Name, number, kind, presence, key)          \
+  {                                                                      \
+    bool mine = BW_CODEC_PRESENT(*this, name, kind, presence);           \
+    if (mine != BW_CODEC_PRESENT(o, name, kind, presence)) return false; \
+    if (mine && !(name##_ == o.name##_)) return false;                   \
   }
 #define BW_CODEC_EQUAL_REPEATED(name, Name, number, Element, key) \
   if (!::bw::record_codec::elementsEqual(name##_, o.name##_)) return false;
 
 #define BW_CODEC_HASH(name, Name, number, kind, presence, key) \
   if (BW_CODEC_PRESENT(*this, name, kind, presence)) h ^= BW_CODEC_OF(kind)::hash(name##_);
-#define BW_CODEC_HASH_REPEATED(name, Name, number, Element, key) h ^= ::bw::record_codec::elementsHash(name##_);
+#define BW_CODEC_HASH_REPEATED(name, Name, number, Element, key) \
+  h ^= ::bw::record_codec::elementsHash(name##_);
 
 #define BW_CODEC_COPY_TO(name, Name, number, kind, presence, key) \
-  if (BW_CODEC_ALWAYS(kind, presence)) {                         \
-    t.name##_ = name##_;                                         \
-    t.putBit(kBit_##name, hasBit(kBit_##name));                  \
-  } else if (hasBit(kBit_##name)) {                              \
-    t.name##_ = name##_;                                         \
-    t.setBit(kBit_##name);                                       \
+  if (BW_CODEC_ALWAYS(kind, presence)) {                          \
+    t.name##_ = name##_;                                          \
+    t.putBit(kBit_##name, hasBit(kBit_##name));                   \
+  } else if (hasBit(kBit_##name)) {                               \
+    t.name##_ = name##_;                                          \
+    t.setBit(kBit_##name);                                        \
   }
 #define BW_CODEC_COPY_TO_REPEATED(name, Name, number, Element, key) \
   if (!name##_.empty() && &t != this) t.name##_ = name##_;
 
-#define BW_CODEC_FIELD_INFO(name, Name, number, kind, presence, key)                           \
-  ::bw::FieldInfo{#name,                                                                       \
-                  number,                                                                      \
-                  BW_CODEC_KIND(kind),                                                         \
-                  BW_CODEC_REQUIRED(presence),                                                         \
-                  key,                                                                         \
-                  kClass,                                                                      \
-                  [](const ::bw::Record& r) -> ::bw::Value {                                   \
-                    const auto& s = static_cast<const Self&>(r);                               \
-                    if (!BW_CODEC_PRESENT(s, name, kind, presence)) return ::bw::Value();      \
-                    return BW_CODEC_OF(kind)::value(s.name##_);                                \
-                  },                                                                           \
-                  [](::bw::Record& r, const ::bw::Value& v) {                                  \
-                    static_cast<Self&>(r).set##Name(BW_CODEC_OF(kind)::from(v));               \
-                  },                                                                           \
+#define BW_CODEC_FIELD_INFO(name, Name, number, kind, presence, key)                      \
+  ::bw::FieldInfo{#name,                                                                  \
+                  number,                                                                 \
+                  BW_CODEC_KIND(kind),                                                    \
+                  BW_CODEC_REQUIRED(presence),                                            \
+                  key,                                                                    \
+                  kClass,                                                                 \
+                  [](const ::bw::Record& r) -> ::bw::Value {                              \
+                    const auto& s = static_cast<const Self&>(r);                          \
+                    if (!BW_CODEC_PRESENT(s, name, kind, presence)) return ::bw::Value(); \
+                    return BW_CODEC_OF(kind)::value(s.name##_);                           \
+                  },                                                                      \
+                  [](::bw::Record& r, const ::bw::Value& v) {                             \
+                    static_cast<Self&>(r).set##Name(BW_CODEC_OF(kind)::from(v));          \
+                  },                                                                      \
                   nullptr},
-#define BW_CODEC_REPEATED_INFO(name, Name, number, Element, key)                                       \
-  ::bw::FieldInfo{#name,                                                                               \
-                  number,                                                                              \
-                  ::bw::FieldKind::Message,                                                            \
-                  false,                                                                               \
-                  key,                                                                                 \
-                  Element::kClass,                                                                     \
-                  [](const ::bw::Record& r) -> ::bw::Value {                                           \
-                    return ::bw::record_codec::elementsValue(static_cast<const Self&>(r).name##_);     \
-                  },                                                                                   \
-                  nullptr,                                                                             \
-                  [](::bw::Record& r, const ::bw::Record& e) {                                         \
-                    const Element* element = ::bw::recordCast<Element>(&e);                            \
-                    if (element != nullptr) static_cast<Self&>(r).add##Name(*element);                 \
+#define BW_CODEC_REPEATED_INFO(name, Name, number, Element, key)                                   \
+  ::bw::FieldInfo{#name,                                                                           \
+                  number,                                                                          \
+                  ::bw::FieldKind::Message,                                                        \
+                  false,                                                                           \
+                  key,                                                                             \
+                  Element::kClass,                                                                 \
+                  [](const ::bw::Record& r) -> ::bw::Value {                                       \
+                    return ::bw::record_codec::elementsValue(static_cast<const Self&>(r).name##_); \
+                  },                                                                               \
+                  nullptr,                                                                         \
+                  [](::bw::Record& r, const ::bw::Record& e) {                                     \
+                    const Element* element = ::bw::recordCast<Element>(&e);                        \
+                    if (element != nullptr) static_cast<Self&>(r).add##Name(*element);             \
                   }},
 
 // Defines every generic operation of `Class` (declared by
 // BW_RECORD_INTERFACE) from its field lists.
-#define BW_RECORD_DEFINE(Class, FIELDS, REPEATED)                                             \
-  bool Class::readFrom(google::protobuf::io::CodedInputStream& input) {                       \
-    for (;;) {                                                                                \
-      if (::bw::record_codec::atEnd(input)) return true;                                      \
-      std::uint64_t key;                                                                      \
-      if (!input.ReadVarint64(&key)) return false;                                            \
-      if ((key & 7) == ::bw::record_codec::WFL::WIRETYPE_END_GROUP) return true;              \
-      switch (key >> 3) {                                                                     \
-        FIELDS(BW_CODEC_READ_CASE)                                                            \
-        REPEATED(BW_CODEC_READ_REPEATED_CASE)                                                 \
-        default:                                                                              \
-          if (!::bw::record_codec::skipField(input, key)) return false;                       \
-      }                                                                                       \
-    }                                                                                         \
-  }                                                                                           \
-  void Class::writeTo(google::protobuf::io::CodedOutputStream& output) const {                \
-    [[maybe_unused]] static constexpr const char* kAssertionSource = "Records/" #Class;       \
-    FIELDS(BW_CODEC_WRITE)                                                                    \
-    REPEATED(BW_CODEC_WRITE_REPEATED)                                                         \
-  }                                                                                           \
-  std::size_t Class::byteSize() const {                                                       \
-    std::size_t total = 0;                                                                    \
-    FIELDS(BW_CODEC_SIZE)                                                                     \
-    REPEATED(BW_CODEC_SIZE_REPEATED)                                                          \
-    return total;                                                                             \
-  }                                                                                           \
-  ::bw::Dictionary Class::dictionaryRepresentation() const {                                  \
-    ::bw::Dictionary d;                                                                       \
-    for (const ::bw::FieldInfo& f : schema().fields) {                                        \
-      ::bw::Value v = f.get(*this);                                                           \
-      if (!v.isNull()) d.emplace(f.key, std::move(v));                                        \
-    }                                                                                         \
-    return d;                                                                                 \
-  }                                                                                           \
-  std::unique_ptr<::bw::Record> Class::copy() const { return std::make_unique<Class>(*this); } \
-  void Class::copyTo(::bw::Record& target) const {                                            \
-    if (target.recordClass() != kClass) ::bw::record_codec::copyTargetMismatch(*this, target); \
-    Class& t = static_cast<Class&>(target);                                                   \
-    FIELDS(BW_CODEC_COPY_TO)                                                                  \
-    REPEATED(BW_CODEC_COPY_TO_REPEATED)                                                       \
-  }                                                                                           \
-  bool Class::isEqual(const ::bw::Record& other) const {                                      \
-    if (other.recordClass() != kClass) return false;                                          \
-    const Class& o = static_cast<const Class&>(other);                                        \
-    FIELDS(BW_CODEC_EQUAL)                                                                    \
-    REPEATED(BW_CODEC_EQUAL_REPEATED)                                                         \
-    return true;                                                                              \
-  }                                                                                           \
-  std::uint64_t Class::hash() const {                                                         \
-    std::uint64_t h = 0;                                                                      \
-    FIELDS(BW_CODEC_HASH)                                                                     \
-    REPEATED(BW_CODEC_HASH_REPEATED)                                                          \
-    return h;                                                                                 \
-  }                                                                                           \
-  const ::bw::RecordSchema& Class::schema() {                                                 \
-    using Self = Class;                                                                       \
-    static constexpr ::bw::FieldInfo kFields[] = {FIELDS(BW_CODEC_FIELD_INFO) REPEATED(BW_CODEC_REPEATED_INFO)}; \
+#define BW_RECORD_DEFINE(Class, FIELDS, REPEATED)                                                  \
+  bool Class::readFrom(google::protobuf::io::CodedInputStream& input) {                            \
+    for (;;) {                                                                                     \
+      if (::bw::record_codec::atEnd(input)) return true;                                           \
+      std::uint64_t key;                                                                           \
+      if (!input.ReadVarint64(&key)) return false;                                                 \
+      if ((key & 7) == ::bw::record_codec::WFL::WIRETYPE_END_GROUP) return true;                   \
+      switch (key >> 3) {                                                                          \
+        FIELDS(BW_CODEC_READ_CASE)                                                                 \
+        REPEATED(BW_CODEC_READ_REPEATED_CASE)                                                      \
+        default:                                                                                   \
+          if (!::bw::record_codec::skipField(input, key)) return false;                            \
+      }                                                                                            \
+    }                                                                                              \
+  }                                                                                                \
+  void Class::writeTo(google::protobuf::io::CodedOutputStream& output) const {                     \
+    [[maybe_unused]] static constexpr const char* kAssertionSource = "Records/" #Class;            \
+    FIELDS(BW_CODEC_WRITE)                                                                         \
+    REPEATED(BW_CODEC_WRITE_REPEATED)                                                              \
+  }                                                                                                \
+  std::size_t Class::byteSize() const {                                                            \
+    std::size_t total = 0;                                                                         \
+    FIELDS(BW_CODEC_SIZE)                                                                          \
+    REPEATED(BW_CODEC_SIZE_REPEATED)                                                               \
+    return total;                                                                                  \
+  }                                                                                                \
+  ::bw::Dictionary Class::dictionaryRepresentation() const {                                       \
+    ::bw::Dictionary d;                                                                            \
+    for (const ::bw::FieldInfo& f : schema().fields) {                                             \
+      ::bw::Value v = f.get(*this);                                                                \
+      if (!v.isNull()) d.emplace(f.key, std::move(v));                                             \
+    }                                                                                              \
+    return d;                                                                                      \
+  }                                                                                                \
+  std::unique_ptr<::bw::Record> Class::copy() const { return std::make_unique<Class>(*this); }     \
+  void Class::copyTo(::bw::Record& target) const {                                                 \
+    if (target.recordClass() != kClass) ::bw::record_codec::copyTargetMismatch(*this, target);     \
+    Class& t = static_cast<Class&>(target);                                                        \
+    FIELDS(BW_CODEC_COPY_TO)                                                                       \
+    REPEATED(BW_CODEC_COPY_TO_REPEATED)                                                            \
+  }                                                                                                \
+  bool Class::isEqual(const ::bw::Record& other) const {                                           \
+    if (other.recordClass() != kClass) return false;                                               \
+    const Class& o = static_cast<const Class&>(other);                                             \
+    FIELDS(BW_CODEC_EQUAL)                                                                         \
+    REPEATED(BW_CODEC_EQUAL_REPEATED)                                                              \
+    return true;                                                                                   \
+  }                                                                                                \
+  std::uint64_t Class::hash() const {                                                              \
+    std::uint64_t h = 0;                                                                           \
+    FIELDS(BW_CODEC_HASH)                                                                          \
+    REPEATED(BW_CODEC_HASH_REPEATED)                                                               \
+    return h;                                                                                      \
+  }                                                                                                \
+  const ::bw::RecordSchema& Class::schema() {                                                      \
+    using Self = Class;                                                                            \
+    static constexpr ::bw::FieldInfo kFields[] = {FIELDS(BW_CODEC_FIELD_INFO)                      \
+                                                      REPEATED(BW_CODEC_REPEATED_INFO)};           \
     static_assert(::bw::record_codec::strictlyAscending(kFields), "fields must ascend by number"); \
-    static const ::bw::RecordSchema kSchema{kClass, #Class, kFields};                         \
-    return kSchema;                                                                           \
+    static const ::bw::RecordSchema kSchema{kClass, #Class, kFields};                              \
+    return kSchema;                                                                                \
   }

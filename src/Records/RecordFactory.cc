@@ -36,7 +36,8 @@ struct ClassEntry {
   const RecordSchema& (*schema)();
 };
 
-template <class T> constexpr ClassEntry entry() {
+template <class T>
+constexpr ClassEntry entry() {
   return ClassEntry{T::kClass, RecordLayout{sizeof(T), alignof(T)},
                     [](void* storage) -> Record* { return new (storage) T(); },
                     []() -> std::unique_ptr<Record> { return std::make_unique<T>(); }, &T::schema};
@@ -44,14 +45,29 @@ template <class T> constexpr ClassEntry entry() {
 
 // In RecordClass order.
 constexpr ClassEntry kClasses[] = {
-    entry<LogStartsV0>(),      entry<LogStartsV1>(),      entry<BatteryChargeLevel>(),
-    entry<PackageEnergyStatistics>(), entry<ProcessUsage>(), entry<PowerStateChange>(),
-    entry<SleepWake>(),        entry<TimeChange>(),       entry<DateChange>(),
-    entry<UserIdle>(),         entry<DeviceChange>(),     entry<Interrupts>(),
-    entry<InterruptVector>(),  entry<SystemMemory>(),     entry<BluetoothPowerResidency>(),
-    entry<SystemIO>(),         entry<Cstates>(),          entry<Cstate>(),
-    entry<DisplayBrightness>(), entry<FanState>(),        entry<SmcKeys>(),
-    entry<SmcKey>(),           entry<PanelSelfRefresh>(),
+    entry<LogStartsV0>(),
+    entry<LogStartsV1>(),
+    entry<BatteryChargeLevel>(),
+    entry<PackageEnergyStatistics>(),
+    entry<ProcessUsage>(),
+    entry<PowerStateChange>(),
+    entry<SleepWake>(),
+    entry<TimeChange>(),
+    entry<DateChange>(),
+    entry<UserIdle>(),
+    entry<DeviceChange>(),
+    entry<Interrupts>(),
+    entry<InterruptVector>(),
+    entry<SystemMemory>(),
+    entry<BluetoothPowerResidency>(),
+    entry<SystemIO>(),
+    entry<Cstates>(),
+    entry<Cstate>(),
+    entry<DisplayBrightness>(),
+    entry<FanState>(),
+    entry<SmcKeys>(),
+    entry<SmcKey>(),
+    entry<PanelSelfRefresh>(),
 };
 static_assert(std::size(kClasses) == kRecordClassCount);
 

@@ -118,16 +118,16 @@ class CodedOutputStream;
   bool has##Name() const { return hasBit(kBit_##name); }           \
   void setHas##Name(bool present) { putBit(kBit_##name, present); }
 
-#define BW_FIELD_OBJECT_ACCESSORS(name, Name)                  \
-  const std::string& name() const { return name##_; }         \
-  void set##Name(std::string value) {                         \
-    name##_ = std::move(value);                               \
-    setBit(kBit_##name);                                      \
-  }                                                           \
-  bool has##Name() const { return hasBit(kBit_##name); }      \
-  void clear##Name() {                                        \
-    std::string().swap(name##_);                              \
-    putBit(kBit_##name, false);                               \
+#define BW_FIELD_OBJECT_ACCESSORS(name, Name)            \
+  const std::string& name() const { return name##_; }    \
+  void set##Name(std::string value) {                    \
+    name##_ = std::move(value);                          \
+    setBit(kBit_##name);                                 \
+  }                                                      \
+  bool has##Name() const { return hasBit(kBit_##name); } \
+  void clear##Name() {                                   \
+    std::string().swap(name##_);                         \
+    putBit(kBit_##name, false);                          \
   }
 
 #define BW_FIELD_ACCESSORS_UInt64(name, Name) BW_FIELD_SCALAR_ACCESSORS(std::uint64_t, name, Name)
@@ -140,12 +140,12 @@ class CodedOutputStream;
 #define BW_FIELD_ACCESSORS_Bytes(name, Name) BW_FIELD_OBJECT_ACCESSORS(name, Name)
 #define BW_FIELD_ACCESSORS(name, Name, number, kind, presence, key) BW_FIELD_ACCESSORS_##kind(name, Name)
 
-#define BW_FIELD_REPEATED_ACCESSORS(name, Name, number, Element, key)                 \
-  const std::vector<Element>& name() const { return name##_; }                        \
-  std::vector<Element>& mutable##Name() { return name##_; }                           \
-  void clear##Name() { name##_.clear(); }                                             \
-  void add##Name(Element element) { name##_.push_back(std::move(element)); }          \
-  std::size_t name##Count() const { return name##_.size(); }                          \
+#define BW_FIELD_REPEATED_ACCESSORS(name, Name, number, Element, key)        \
+  const std::vector<Element>& name() const { return name##_; }               \
+  std::vector<Element>& mutable##Name() { return name##_; }                  \
+  void clear##Name() { name##_.clear(); }                                    \
+  void add##Name(Element element) { name##_.push_back(std::move(element)); } \
+  std::size_t name##Count() const { return name##_.size(); }                 \
   const Element& name##AtIndex(std::size_t index) const { return name##_.at(index); }
 
 // A class without repeated fields passes this as its repeated list.
@@ -153,34 +153,34 @@ class CodedOutputStream;
 
 // The public part of a record class: construction, field accessors and the
 // Record operations that every class implements the same way.
-#define BW_RECORD_INTERFACE(Class, FIELDS, REPEATED)                                  \
-  static constexpr ::bw::RecordClass kClass = ::bw::RecordClass::Class;              \
-  Class() : ::bw::Record(kClass) {}                                                  \
-  FIELDS(BW_FIELD_ACCESSORS)                                                         \
-  REPEATED(BW_FIELD_REPEATED_ACCESSORS)                                              \
-  bool readFrom(google::protobuf::io::CodedInputStream& input) override;            \
-  void writeTo(google::protobuf::io::CodedOutputStream& output) const override;     \
-  std::size_t byteSize() const override;                                             \
-  ::bw::Dictionary dictionaryRepresentation() const override;                        \
-  std::unique_ptr<::bw::Record> copy() const override;                               \
-  void copyTo(::bw::Record& target) const override;                                  \
-  bool isEqual(const ::bw::Record& other) const override;                            \
-  std::uint64_t hash() const override;                                               \
+#define BW_RECORD_INTERFACE(Class, FIELDS, REPEATED)                            \
+  static constexpr ::bw::RecordClass kClass = ::bw::RecordClass::Class;         \
+  Class() : ::bw::Record(kClass) {}                                             \
+  FIELDS(BW_FIELD_ACCESSORS)                                                    \
+  REPEATED(BW_FIELD_REPEATED_ACCESSORS)                                         \
+  bool readFrom(google::protobuf::io::CodedInputStream& input) override;        \
+  void writeTo(google::protobuf::io::CodedOutputStream& output) const override; \
+  std::size_t byteSize() const override;                                        \
+  ::bw::Dictionary dictionaryRepresentation() const override;                   \
+  std::unique_ptr<::bw::Record> copy() const override;                          \
+  void copyTo(::bw::Record& target) const override;                             \
+  bool isEqual(const ::bw::Record& other) const override;                       \
+  std::uint64_t hash() const override;                                          \
   static const ::bw::RecordSchema& schema();
 
 // The private part: has-flags and members. The has-flags are bytes so that
 // they, like the one-byte and four-byte fields, can sit in the base's
 // padding right after its class tag.
-#define BW_RECORD_STORAGE(FIELDS, REPEATED)                                                  \
-  enum : unsigned { FIELDS(BW_FIELD_BIT_ENUM) kFieldCount };                                  \
-  bool hasBit(unsigned i) const { return ((has_[i >> 3] >> (i & 7)) & 1u) != 0; }              \
-  void setBit(unsigned i) { has_[i >> 3] = std::uint8_t(has_[i >> 3] | (1u << (i & 7))); }    \
-  void putBit(unsigned i, bool on) {                                                          \
+#define BW_RECORD_STORAGE(FIELDS, REPEATED)                                                             \
+  enum : unsigned { FIELDS(BW_FIELD_BIT_ENUM) kFieldCount };                                            \
+  bool hasBit(unsigned i) const { return ((has_[i >> 3] >> (i & 7)) & 1u) != 0; }                       \
+  void setBit(unsigned i) { has_[i >> 3] = std::uint8_t(has_[i >> 3] | (1u << (i & 7))); }              \
+  void putBit(unsigned i, bool on) {                                                                    \
     has_[i >> 3] = std::uint8_t(on ? has_[i >> 3] | (1u << (i & 7)) : has_[i >> 3] & ~(1u << (i & 7))); \
-  }                                                                                           \
-  std::uint8_t has_[(kFieldCount + 7) / 8] = {};                                              \
-  FIELDS(BW_FIELD_MEMBER_ONE)                                                                 \
-  FIELDS(BW_FIELD_MEMBER_FOUR)                                                                \
-  FIELDS(BW_FIELD_MEMBER_EIGHT)                                                               \
-  FIELDS(BW_FIELD_MEMBER_OBJECT)                                                              \
+  }                                                                                                     \
+  std::uint8_t has_[(kFieldCount + 7) / 8] = {};                                                        \
+  FIELDS(BW_FIELD_MEMBER_ONE)                                                                           \
+  FIELDS(BW_FIELD_MEMBER_FOUR)                                                                          \
+  FIELDS(BW_FIELD_MEMBER_EIGHT)                                                                         \
+  FIELDS(BW_FIELD_MEMBER_OBJECT)                                                                        \
   REPEATED(BW_FIELD_REPEATED_MEMBER)

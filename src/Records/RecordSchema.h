@@ -16,11 +16,11 @@ namespace bw {
 enum class FieldKind : std::uint8_t { UInt64, SInt64, UInt32, Int32, Bool, Double, String, Bytes, Message };
 
 struct FieldInfo {
-  const char* name;        // the property name (`absoluteTime`)
-  std::uint32_t number;    // the field number on the wire
+  const char* name;      // the property name (`absoluteTime`)
+  std::uint32_t number;  // the field number on the wire
   FieldKind kind;
-  bool required;           // always written; a required scalar is always present
-  const char* key;         // the dictionary key (`absolute_time`)
+  bool required;             // always written; a required scalar is always present
+  const char* key;           // the dictionary key (`absolute_time`)
   RecordClass elementClass;  // kind Message: the class of the elements
 
   // The field's value as its dictionary shows it: unsigned integers as

@@ -28,7 +28,8 @@ TEST_P(ProcessUsageTime, IsNowForRunningProcessesAndTheExitOtherwise) {
 INSTANTIATE_TEST_SUITE_P(ProcessUsage, ProcessUsageTime,
                          ::testing::Values(StatusCase{"Running", -1, 5000}, StatusCase{"Sampled", -3, 5000},
                                            StatusCase{"MinusTwo", -2, 3000}, StatusCase{"Zero", 0, 3000},
-                                           StatusCase{"Failure", 1, 3000}, StatusCase{"Absent", std::nullopt, 3000}),
+                                           StatusCase{"Failure", 1, 3000},
+                                           StatusCase{"Absent", std::nullopt, 3000}),
                          [](const auto& info) { return std::string(info.param.name); });
 
 TEST(ProcessUsage, TimeSurvivesEncoding) {

@@ -156,11 +156,11 @@ TEST(RecordCodec, UnknownFieldsOfEveryWireTypeAndFieldZeroAreSkipped) {
                                 .bytes(2, "nested")
                                 .groupEnd(43)
                                 .fixed32(44, 7)
-                                .key(0)   // field 0, varint
+                                .key(0)  // field 0, varint
                                 .raw("\x05")
-                                .key(2)   // field 0, length-delimited
+                                .key(2)  // field 0, length-delimited
                                 .raw("\x02xy")
-                                .key(3)   // field 0, a group
+                                .key(3)  // field 0, a group
                                 .varint(1, 1)
                                 .key(4)
                                 .key(std::uint64_t{1} << 35)  // a key wider than 32 bits
@@ -228,7 +228,8 @@ INSTANTIATE_TEST_SUITE_P(
     ::testing::Values(
         Malformed{"KeyCutShort", RecordClass::UserIdle, "\x80"},
         Malformed{"VarintCutShort", RecordClass::UserIdle, cut(WireBytes().varint(1, 300).str())},
-        Malformed{"SignedVarintCutShort", RecordClass::BatteryChargeLevel, cut(WireBytes().sint(2, -300).str())},
+        Malformed{"SignedVarintCutShort", RecordClass::BatteryChargeLevel,
+                  cut(WireBytes().sint(2, -300).str())},
         Malformed{"StringCutShort", RecordClass::DeviceChange, cut(WireBytes().bytes(3, "abcdef").str())},
         Malformed{"StringLengthMissing", RecordClass::DeviceChange, WireBytes().key(3 << 3 | 2).str()},
         Malformed{"DoubleCutShort", RecordClass::SmcKey, cut(WireBytes().fixed64(4, 1).str(), 3)},
@@ -272,7 +273,8 @@ TEST(RecordCodec, DecodesWithinALimitAndLeavesTheRestOfTheStream) {
   const std::string a = first.serialize();
   const std::string b = second.serialize();
   const std::string stream = a + b;
-  pbio::CodedInputStream input(reinterpret_cast<const std::uint8_t*>(stream.data()), static_cast<int>(stream.size()));
+  pbio::CodedInputStream input(reinterpret_cast<const std::uint8_t*>(stream.data()),
+                               static_cast<int>(stream.size()));
 
   UserIdle decoded;
   pbio::CodedInputStream::Limit limit = input.PushLimit(static_cast<int>(a.size()));

@@ -26,7 +26,8 @@ std::unique_ptr<Record> decode(RecordClass c, const std::string& bytes) {
 }
 
 namespace {
-template <class Write> void append(std::string& bytes, Write write) {
+template <class Write>
+void append(std::string& bytes, Write write) {
   pb::io::StringOutputStream stream(&bytes);
   pb::io::CodedOutputStream output(&stream);
   write(output);
@@ -119,7 +120,9 @@ void fillRandomly(Record& record, std::mt19937_64& random) {
     }
     if (!f.required && random() % 3 == 0) continue;
     switch (f.kind) {
-      case FieldKind::UInt64: f.set(record, Value(static_cast<unsigned long long>(randomUnsigned(random)))); break;
+      case FieldKind::UInt64:
+        f.set(record, Value(static_cast<unsigned long long>(randomUnsigned(random))));
+        break;
       case FieldKind::UInt32:
         f.set(record, Value(static_cast<unsigned long long>(randomUnsigned(random) & 0xFFFFFFFFu)));
         break;

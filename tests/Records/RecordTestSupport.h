@@ -19,7 +19,8 @@ bool decodeInto(Record& record, const std::string& bytes);
 // A new record of class `c` decoded from `bytes`, or null when readFrom fails.
 std::unique_ptr<Record> decode(RecordClass c, const std::string& bytes);
 
-template <class T> std::unique_ptr<T> decodeAs(const std::string& bytes) {
+template <class T>
+std::unique_ptr<T> decodeAs(const std::string& bytes) {
   auto record = std::make_unique<T>();
   if (!decodeInto(*record, bytes)) return nullptr;
   return record;

@@ -35,7 +35,8 @@ TEST_P(OneLineText, MatchesTheExpectedText) {
   EXPECT_EQ(*text, GetParam().expected);
 }
 
-template <class T, class Setup> std::function<std::unique_ptr<Record>()> build(Setup setup) {
+template <class T, class Setup>
+std::function<std::unique_ptr<Record>()> build(Setup setup) {
   return [setup]() -> std::unique_ptr<Record> {
     auto record = std::make_unique<T>();
     setup(*record);
@@ -85,7 +86,8 @@ INSTANTIATE_TEST_SUITE_P(
                    r.setBootUuid(rawBytes(kBoot));
                    r.setLastBootUuid(kLastBoot.string());
                  }),
-                 "LogStartsV1\t23A344\t0F1E2D3C-4B5A-6978-8796-A5B4C3D2E1F0\t12345678-9ABC-DEF0-0FED-CBA987654321"},
+                 "LogStartsV1\t23A344\t0F1E2D3C-4B5A-6978-8796-A5B4C3D2E1F0\t12345678-9ABC-DEF0-0FED-"
+                 "CBA987654321"},
         TextCase{"LogStartsV1WithNothing", build<LogStartsV1>([](LogStartsV1&) {}), "LogStartsV1\t\t\t"},
         TextCase{"BatteryChargeLevel", build<BatteryChargeLevel>([](BatteryChargeLevel& r) {
                    r.setCharge(4321);
@@ -107,8 +109,10 @@ INSTANTIATE_TEST_SUITE_P(
         TextCase{"BatteryChargeLevelWithoutMaxCharge",
                  build<BatteryChargeLevel>([](BatteryChargeLevel& r) { r.setCharge(10); }),
                  "BatteryChargeLevel\tinf\t10\t0\t0\t"},
-        TextCase{"PowerStateChangeAC", build<PowerStateChange>([](PowerStateChange&) {}), "PowerStateChange\tA/C"},
-        TextCase{"PowerStateChangeBattery", build<PowerStateChange>([](PowerStateChange& r) { r.setChange(2); }),
+        TextCase{"PowerStateChangeAC", build<PowerStateChange>([](PowerStateChange&) {}),
+                 "PowerStateChange\tA/C"},
+        TextCase{"PowerStateChangeBattery",
+                 build<PowerStateChange>([](PowerStateChange& r) { r.setChange(2); }),
                  "PowerStateChange\tBattery"},
         TextCase{"SleepWakeSleep", build<SleepWake>([](SleepWake& r) { r.setWakeType("ignored"); }), "Sleep"},
         TextCase{"SleepWakeWake", build<SleepWake>([](SleepWake& r) {
@@ -131,7 +135,8 @@ INSTANTIATE_TEST_SUITE_P(
                    r.setExitStatus(0);
                  }),
                  "ProcessUsage\t0\t 3100 msec\t01:02:02\t    42 intr wkups\tresident  1048576\t321 [mds]"},
-        TextCase{"ProcessUsageWithoutExitStatus", build<ProcessUsage>([](ProcessUsage& r) { r = exitedProcess(); }),
+        TextCase{"ProcessUsageWithoutExitStatus",
+                 build<ProcessUsage>([](ProcessUsage& r) { r = exitedProcess(); }),
                  "ProcessUsage\t0\t 3100 msec\t01:02:02\t    42 intr wkups\tresident  1048576\t321 [mds]"},
         TextCase{"ProcessUsageFailed", build<ProcessUsage>([](ProcessUsage& r) {
                    r = exitedProcess();
@@ -150,10 +155,12 @@ INSTANTIATE_TEST_SUITE_P(
                  "ProcessUsage\tS\t 3100 msec\t00:00:00\t    42 intr wkups\tresident  1048576\t321 [mds]"},
         TextCase{"ProcessUsageEmpty", build<ProcessUsage>([](ProcessUsage&) {}),
                  "ProcessUsage\t0\t    0 msec\t00:00:00\t     0 intr wkups\tresident        0\t0 []"},
-        TextCase{"PackageEnergyStatistics",
-                 build<PackageEnergyStatistics>([](PackageEnergyStatistics& r) { r.setPkgCanyResidency(987); }),
+        TextCase{"PackageEnergyStatistics", build<PackageEnergyStatistics>([](PackageEnergyStatistics& r) {
+                   r.setPkgCanyResidency(987);
+                 }),
                  "PackageEnergyStatistics\t987"},
-        TextCase{"PackageEnergyStatisticsAbsent", build<PackageEnergyStatistics>([](PackageEnergyStatistics& r) {
+        TextCase{"PackageEnergyStatisticsAbsent",
+                 build<PackageEnergyStatistics>([](PackageEnergyStatistics& r) {
                    r.setPkgCanyResidency(987);
                    r.setHasPkgCanyResidency(false);
                  }),
@@ -193,7 +200,8 @@ INSTANTIATE_TEST_SUITE_P(
                    r.addStates(state(3, 12345678));
                  }),
                  "Core 3 C-state detail: C3 12345678   "},
-        TextCase{"DisplayBrightness", build<DisplayBrightness>([](DisplayBrightness& r) { r.setBrightness(75); }),
+        TextCase{"DisplayBrightness",
+                 build<DisplayBrightness>([](DisplayBrightness& r) { r.setBrightness(75); }),
                  "DisplayBrightness\t75%"},
         TextCase{"FanState", build<FanState>([](FanState& r) {
                    r.setLoudness(2);
@@ -206,9 +214,9 @@ INSTANTIATE_TEST_SUITE_P(
 
 TEST(OneLineText, OnlyTheTwelveClassesHaveOne) {
   const std::set<RecordClass> withText = {
-      RecordClass::BatteryChargeLevel, RecordClass::SleepWake, RecordClass::LogStartsV1,
-      RecordClass::PowerStateChange,   RecordClass::Cstates,   RecordClass::PackageEnergyStatistics,
-      RecordClass::DeviceChange,       RecordClass::FanState,  RecordClass::DisplayBrightness,
+      RecordClass::BatteryChargeLevel, RecordClass::SleepWake,    RecordClass::LogStartsV1,
+      RecordClass::PowerStateChange,   RecordClass::Cstates,      RecordClass::PackageEnergyStatistics,
+      RecordClass::DeviceChange,       RecordClass::FanState,     RecordClass::DisplayBrightness,
       RecordClass::UserIdle,           RecordClass::ProcessUsage, RecordClass::Interrupts,
   };
   for (RecordClass c : test::allRecordClasses())

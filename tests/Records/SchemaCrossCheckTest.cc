@@ -48,8 +48,9 @@ class SchemaCrossCheck : public ::testing::Test {
     }
     test::TempDir temp;
     const std::string output = temp / "schema.pb";
-    test::ToolResult result = test::runBinary(
-        protoc, {"--proto_path=" + dir.string(), "--descriptor_set_out=" + output, (dir / "brindlewick.proto").string()});
+    test::ToolResult result =
+        test::runBinary(protoc, {"--proto_path=" + dir.string(), "--descriptor_set_out=" + output,
+                                 (dir / "brindlewick.proto").string()});
     if (result.status != 0) {
       problem_ = "protoc failed: " + result.err;
       return;
@@ -122,8 +123,12 @@ Dictionary dictionaryOf(const pb::Message& m, const RecordSchema& schema) {
     if (!r->HasField(m, fd)) continue;
     Value v;
     switch (fd->type()) {
-      case FieldDescriptor::TYPE_UINT64: v = Value(static_cast<unsigned long long>(r->GetUInt64(m, fd))); break;
-      case FieldDescriptor::TYPE_UINT32: v = Value(static_cast<unsigned long long>(r->GetUInt32(m, fd))); break;
+      case FieldDescriptor::TYPE_UINT64:
+        v = Value(static_cast<unsigned long long>(r->GetUInt64(m, fd)));
+        break;
+      case FieldDescriptor::TYPE_UINT32:
+        v = Value(static_cast<unsigned long long>(r->GetUInt32(m, fd)));
+        break;
       case FieldDescriptor::TYPE_SINT64: v = Value(static_cast<long long>(r->GetInt64(m, fd))); break;
       case FieldDescriptor::TYPE_INT32: v = Value(static_cast<long long>(r->GetInt32(m, fd))); break;
       case FieldDescriptor::TYPE_BOOL: v = Value(r->GetBool(m, fd)); break;
@@ -157,7 +162,9 @@ void fillDynamically(pb::Message& m, std::mt19937_64& random) {
         r->SetUInt32(&m, fd, static_cast<std::uint32_t>(test::randomUnsigned(random)));
         break;
       case FieldDescriptor::TYPE_SINT64: r->SetInt64(&m, fd, test::randomSigned(random)); break;
-      case FieldDescriptor::TYPE_INT32: r->SetInt32(&m, fd, static_cast<std::int32_t>(test::randomSigned(random))); break;
+      case FieldDescriptor::TYPE_INT32:
+        r->SetInt32(&m, fd, static_cast<std::int32_t>(test::randomSigned(random)));
+        break;
       case FieldDescriptor::TYPE_BOOL: r->SetBool(&m, fd, random() % 2 == 0); break;
       case FieldDescriptor::TYPE_DOUBLE: r->SetDouble(&m, fd, test::randomDouble(random)); break;
       case FieldDescriptor::TYPE_STRING: r->SetString(&m, fd, test::randomText(random)); break;
@@ -220,7 +227,8 @@ TEST_F(SchemaCrossCheck, OurBytesParseAsTheSameMessage) {
       std::unique_ptr<pb::Message> message = newMessage(c);
       ASSERT_NE(message, nullptr);
       ASSERT_TRUE(message->ParseFromString(bytes)) << record->description();
-      EXPECT_EQ(dictionaryOf(*message, recordSchema(c)), record->dictionaryRepresentation()) << record->description();
+      EXPECT_EQ(dictionaryOf(*message, recordSchema(c)), record->dictionaryRepresentation())
+          << record->description();
       EXPECT_EQ(message->SerializeAsString(), bytes) << record->description();
     }
   }
@@ -236,7 +244,8 @@ TEST_F(SchemaCrossCheck, TheLibrarysBytesDecodeToTheSameRecord) {
       const std::string bytes = message->SerializeAsString();
       std::unique_ptr<Record> record = test::decode(c, bytes);
       ASSERT_NE(record, nullptr) << message->DebugString();
-      EXPECT_EQ(record->dictionaryRepresentation(), dictionaryOf(*message, recordSchema(c))) << message->DebugString();
+      EXPECT_EQ(record->dictionaryRepresentation(), dictionaryOf(*message, recordSchema(c)))
+          << message->DebugString();
       EXPECT_EQ(record->serialize(), bytes) << message->DebugString();
     }
   }
@@ -245,7 +254,7 @@ TEST_F(SchemaCrossCheck, TheLibrarysBytesDecodeToTheSameRecord) {
 TEST_F(SchemaCrossCheck, AFramedStreamOfRecordsParsesAsTheFileMessage) {
   std::mt19937_64 random(7);
   const std::vector<std::pair<int, RecordClass>> records = {
-      {12, RecordClass::LogStartsV1}, {7, RecordClass::SleepWake},  {8, RecordClass::SleepWake},
+      {12, RecordClass::LogStartsV1}, {7, RecordClass::SleepWake},    {8, RecordClass::SleepWake},
       {14, RecordClass::Interrupts},  {4, RecordClass::ProcessUsage}, {14, RecordClass::Interrupts}};
   std::string stream;
   std::vector<std::unique_ptr<Record>> written;
