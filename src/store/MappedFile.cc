@@ -1,0 +1,34 @@
+#include "store/MappedFile.h"
+
+#include <fcntl.h>
+#include <sys/mman.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+namespace bw {
+
+MappedFile::MappedFile(const std::string& path) {
+  int fd = open(path.c_str(), O_RDONLY | O_CLOEXEC);
+  if (fd < 0) return;
+  struct stat st {};
+  if (fstat(fd, &st) == 0 && S_ISREG(st.st_mode)) {
+    size_ = static_cast<std::size_t>(st.st_size);
+    if (size_ == 0) {
+      ok_ = true;
+    } else {
+      void* p = mmap(nullptr, size_, PROT_READ, MAP_PRIVATE, fd, 0);
+      if (p != MAP_FAILED) {
+        madvise(p, size_, MADV_SEQUENTIAL);
+        data_ = static_cast<const std::uint8_t*>(p);
+        ok_ = mapped_ = true;
+      }
+    }
+  }
+  close(fd);
+}
+
+MappedFile::~MappedFile() {
+  if (mapped_) munmap(const_cast<std::uint8_t*>(data_), size_);
+}
+
+}  // namespace bw

@@ -1,0 +1,48 @@
+#pragma once
+// Reads the stats files of a run into records grouped by the boot that wrote
+// them.
+//
+// A file is a sequence of (key varint, length-delimited body); the key's
+// value >> 3 is the type number. A file must begin with a LogStartsV1
+// header; files failing the -B/-b filters, version-0 files and files not
+// starting with a header are dropped whole. A file whose decoding fails
+// mid-way leaves its boot only the headers. Records stamped earlier than the
+// latest header of their file are discarded.
+#include <string>
+#include <unordered_map>
+#include <vector>
+
+#include "base/Uuid.h"
+#include "cli/Options.h"
+#include "store/RecordPool.h"
+
+namespace bw {
+
+// Non-owning record pointers per boot: the records of all files of that boot,
+// file after file, each file's records in file order. A header without a boot
+// UUID files its records under the all-zero UUID.
+using BootRecords = std::unordered_map<Uuid, std::vector<Record*>>;
+
+struct RecordsByBoot {
+  RecordPool pool;  // owns every record
+  BootRecords boots;
+};
+
+// What one file contributed.
+struct FileRecords {
+  std::vector<Record*> records;  // empty when the file was dropped
+  bool damaged = false;          // decoding failed after the header was read
+};
+
+// Reads the file list of `options` (which may end the run for an empty
+// `--from` directory) in ascending path order. Raises "duplicate boot uuid
+// detected" when a boot has two files written by writer 5.
+RecordsByBoot readAllRecords(const Options& options);
+
+// Reads one file into `pool`, applying the per-file rules.
+FileRecords readStatsFile(const std::string& path, const Options& options, RecordPool& pool);
+
+// Reads the given files, in the given order, and groups them by boot.
+RecordsByBoot readStatsFiles(const std::vector<std::string>& paths, const Options& options);
+
+}  // namespace bw
