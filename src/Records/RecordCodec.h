@@ -53,11 +53,12 @@ inline std::uint64_t hashBytes(const std::string& s) { return std::hash<std::str
 // True when no byte of the message is left: at the pushed limit, or at the
 // end of a stream that has no limit.
 inline bool atEnd(CodedInputStream& in) {
-  int left = in.BytesUntilLimit();
-  if (left >= 0) return left == 0;
+  if (in.ExpectAtEnd()) return true;  // inline: at the limit or the end of an in-memory buffer
   const void* data;
   int size;
-  return !in.GetDirectBufferPointer(&data, &size);
+  in.GetDirectBufferPointerInline(&data, &size);
+  if (size > 0) return false;
+  return !in.GetDirectBufferPointer(&data, &size);  // refills, unless at the limit or the end
 }
 
 // Skips one field's value by the key's wire type. The library refuses field
