@@ -40,10 +40,10 @@ class DataSet {
   std::uint64_t indexForPosition(std::uint64_t position) const;
 
   // Indexes of the samples with L <= position < L + N, as (first, count).
-  // An empty set answers (kNotFound, 0); no sample in range gives count 0
-  // at the index where such samples would start (e.g. over 10, 20, 30:
-  // (11, 9) gives (2, 0), (40, 5) gives (3, 0)). A range whose end wraps
-  // past 2^64 selects nothing.
+  // An empty set answers (kNotFound, 0). With no sample in range the count
+  // is 0 and the location only roughly where such samples would be: over
+  // 10, 20, 30, (10, 20) gives (0, 2), (11, 9) gives (2, 0), (40, 5) gives
+  // (3, 0). A range whose end wraps past 2^64 selects nothing.
   Range indexRangeForRange(Range range) const;
 
   // Calls `visitor(position, value)` for each sample of `indexRangeForRange`,

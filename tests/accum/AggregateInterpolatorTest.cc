@@ -4,7 +4,7 @@
 
 #include <cmath>
 
-#include "Thrown.h"
+#include "Support.h"
 #include "accum/IncreasingInterpolator.h"
 
 namespace bw {

@@ -1,9 +1,10 @@
 #pragma once
-// Runs a call that must throw a bw::Exception and hands the exception back
-// for its name, reason and user info to be checked.
+// Helpers for the accumulator tests: catching a bw::Exception to check its
+// name, reason and user info, and an object's address as "%p" prints it.
 #include <gtest/gtest.h>
 
 #include <any>
+#include <cstdio>
 #include <optional>
 #include <string>
 
@@ -33,6 +34,12 @@ T info(const Exception& e, const std::string& key) {
   if (const T* v = std::any_cast<T>(&it->second)) return *v;
   ADD_FAILURE() << "user info \"" << key << "\" holds " << it->second.type().name();
   return T{};
+}
+
+inline std::string addressOf(const void* object) {
+  char text[32];
+  std::snprintf(text, sizeof text, "%p", object);
+  return text;
 }
 
 }  // namespace bw::test
