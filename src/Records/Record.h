@@ -85,13 +85,21 @@ class Record {
   // Copies into `target`, which must be of the same class (else an
   // NSInvalidArgumentException): required scalars always, every other field
   // only when present here, repeated fields only when they have elements
-  // (they then replace the target's). Fields absent here keep the target's.
-  // Classes other than the record classes do not support it (abort).
+  // (they then replace the target's; elements are values, so they are
+  // copied). Fields absent here keep the target's. Overrides such as a given
+  // boot UUID are not fields and are not copied. Classes other than the
+  // record classes do not support it (abort).
   virtual void copyTo(Record& target) const;
 
   // A new record with every field (and every override) duplicated.
   virtual std::unique_ptr<Record> copy() const = 0;
+  // True only for a record of exactly this class whose fields all agree,
+  // presence included (a required scalar is always present).
   virtual bool isEqual(const Record& other) const = 0;
+  // The exclusive-or of one term per present field: integers and booleans
+  // times 2654435761, strings, bytes and repeated fields by their contents,
+  // doubles by their rounded magnitude and scaled fraction. Equal records
+  // hash equal.
   virtual std::uint64_t hash() const = 0;
 
  protected:

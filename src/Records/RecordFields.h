@@ -25,10 +25,14 @@
 // dictionary; its has-flag only tells whether a value was set or read.
 // Byte buffers are std::string (a 16-byte UUID stays inside the object).
 //
+// Decoding reads a known field with its declared kind whatever wire type its
+// key claims, skips unknown fields and field 0, stops at an end-group key,
+// and fails on truncation (details in RecordCodec.h).
+//
 // Storage is compact: has-flags packed as bits, scalars as plain members
-// grouped by size, no heap allocation
-// beyond long strings and repeated elements. Records hold nothing that ties
-// them to where they live, so they can be placement-constructed in bulk.
+// grouped by size, no heap allocation beyond long strings and repeated
+// elements. Records hold nothing that ties them to where they live, so they
+// can be placement-constructed in bulk (RecordFactory.h).
 #include <cstdint>
 #include <string>
 #include <utility>
