@@ -1,0 +1,29 @@
+#include "summarizers/ModelSummarizers.h"
+
+#include "summarizers/BatterySummarizer.h"
+#include "summarizers/PowerStateSummarizers.h"
+#include "summarizers/StandbySummarizer.h"
+
+namespace bw {
+
+std::vector<std::pair<std::string, std::unique_ptr<Summarizer>>> makeModelSummarizers() {
+  std::vector<std::pair<std::string, std::unique_ptr<Summarizer>>> all;
+  auto add = [&all](const char* key, std::unique_ptr<Summarizer> summarizer) {
+    all.emplace_back(key, std::move(summarizer));
+  };
+  add("A/C", std::make_unique<ACPowerSummarizer>());
+  add("Battery", std::make_unique<BatteryPowerSummarizer>());
+  add("Active", std::make_unique<UserActiveSummarizer>());
+  add("Idle", std::make_unique<UserIdleSummarizer>());
+  add("Sleep", std::make_unique<SleepSummarizer>());
+  add("Wake", std::make_unique<WakeSummarizer>());
+  add("DarkWake", std::make_unique<DarkWakeSummarizer>());
+  add("Bluetooth", std::make_unique<BluetoothSummarizer>());
+  add("DiscreteGraphics", std::make_unique<DiscreteGraphicsSummarizer>());
+  add("Wi-Fi", std::make_unique<WiFiSummarizer>());
+  add("Power", std::make_unique<BatterySummarizer>());
+  add("Standby", std::make_unique<StandbySummarizer>());
+  return all;
+}
+
+}  // namespace bw

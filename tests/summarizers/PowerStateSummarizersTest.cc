@@ -1,0 +1,115 @@
+#include "summarizers/PowerStateSummarizers.h"
+
+#include <gtest/gtest.h>
+
+#include <map>
+
+#include "Events.h"
+#include "summarizers/BatterySummarizer.h"
+#include "summarizers/ModelSummarizers.h"
+#include "summarizers/StandbySummarizer.h"
+
+namespace bw {
+namespace {
+
+using test::device;
+using test::feed;
+using Ranges = std::vector<Range>;
+
+// Every model summarizer fed the same records: ranges by key.
+class States {
+ public:
+  States() {
+    for (auto& [key, s] : makeModelSummarizers()) all_[key] = std::move(s);
+  }
+  void add(const Record& r, std::uint64_t position, std::uint8_t bootNumber = 1) {
+    for (auto& [key, s] : all_) feed(*s, r, position, bootNumber);
+  }
+  void finish(std::uint64_t last) {
+    for (auto& [key, s] : all_) s->setLastPosition(last);
+  }
+  Ranges operator[](const std::string& key) const { return all_.at(key)->ranges(); }
+  const Summarizer& summarizer(const std::string& key) const { return *all_.at(key); }
+
+ private:
+  std::map<std::string, std::unique_ptr<Summarizer>> all_;
+};
+
+// A device type that no summarizer knows: it marks a record's position only.
+const DeviceChange kNeutral = device(1, 1);
+
+TEST(ModelSummarizers, RegistersEachKindUnderItsKeyWithItsOwnIdentifier) {
+  const States states;
+  const std::map<std::string, std::string> identifiers = {
+      {"A/C", "ACPower"},       {"Battery", "BatteryPower"}, {"Active", "Active"},
+      {"Idle", "Idle"},         {"Sleep", "Sleep"},          {"Wake", "Wake"},
+      {"DarkWake", "DarkWake"}, {"Bluetooth", "Bluetooth"},  {"DiscreteGraphics", "DiscreteGraphics"},
+      {"Wi-Fi", "Wi-Fi"},       {"Power", ""},               {"Standby", ""}};
+  EXPECT_EQ(makeModelSummarizers().size(), identifiers.size());
+  for (const auto& [key, identifier] : identifiers) EXPECT_EQ(states.summarizer(key).identifier(), identifier) << key;
+  EXPECT_NE(dynamic_cast<const BatterySummarizer*>(&states.summarizer("Power")), nullptr);
+  EXPECT_NE(dynamic_cast<const StandbySummarizer*>(&states.summarizer("Standby")), nullptr);
+}
+
+TEST(PowerStates, SleepThenDarkWakeThenWakeSplitTheTimeline) {
+  States states;
+  states.add(kNeutral, 0);
+  states.add(test::sleepWake(0), 100);
+  states.add(test::sleepWake(2), 150);
+  states.add(test::sleepWake(1), 200);
+  states.add(kNeutral, 300);
+  EXPECT_EQ(states["Sleep"], (Ranges{{100, 50}}));
+  EXPECT_EQ(states["DarkWake"], (Ranges{{150, 50}}));
+  EXPECT_EQ(states["Wake"], (Ranges{{0, 100}}));  // open again from 200
+  states.finish(300);
+  EXPECT_EQ(states["Wake"], (Ranges{{0, 100}, {200, 100}}));
+  EXPECT_EQ(states["Sleep"], (Ranges{{100, 50}}));
+}
+
+TEST(PowerStates, OnlyWakeAndActiveStartAtBootAndEveryStateEndsAtShutdown) {
+  States states;
+  states.add(kNeutral, 10);
+  states.add(test::sleepWake(0), 20);
+  states.add(kNeutral, 30);
+  states.add(kNeutral, 40, 2);
+  states.add(kNeutral, 60, 2);
+  states.finish(60);
+  EXPECT_EQ(states["Wake"], (Ranges{{10, 10}, {40, 20}}));
+  EXPECT_EQ(states["Active"], (Ranges{{10, 20}, {40, 20}}));
+  EXPECT_EQ(states["Sleep"], (Ranges{{20, 10}}));  // closed at boot 1's last record
+  for (const char* key : {"A/C", "Battery", "Idle", "DarkWake", "Wi-Fi", "Bluetooth", "DiscreteGraphics"}) {
+    EXPECT_TRUE(states[key].empty()) << key;
+  }
+}
+
+TEST(PowerStates, PowerSourceAndUserIdleFollowTheirCodes) {
+  States states;
+  states.add(test::powerChange(0), 0);
+  states.add(test::userIdle(1), 30);
+  states.add(test::powerChange(1), 50);
+  states.add(test::userIdle(0), 70);
+  states.add(test::powerChange(std::uint64_t{1} << 32), 80);  // compared as 32 bits: external power
+  states.finish(100);
+  EXPECT_EQ(states["A/C"], (Ranges{{0, 50}, {80, 20}}));
+  EXPECT_EQ(states["Battery"], (Ranges{{50, 30}}));
+  EXPECT_EQ(states["Active"], (Ranges{{0, 30}, {70, 30}}));
+  EXPECT_EQ(states["Idle"], (Ranges{{30, 40}}));
+}
+
+TEST(PowerStates, DevicesFollowTheirOwnTypeOnly) {
+  States states;
+  states.add(device(5, 1), 10);
+  states.add(device(6, 1), 20);
+  states.add(device(5, 0), 30);
+  states.add(device(5, 0), 40);  // Wi-Fi already off: nothing changes
+  states.add(device(9, 2), 50);  // any non-zero connection state turns it on
+  states.add(device(6, 0), 60);
+  states.add(device(9, 0), 70);
+  states.finish(100);
+  EXPECT_EQ(states["Wi-Fi"], (Ranges{{10, 20}}));
+  EXPECT_EQ(states["Bluetooth"], (Ranges{{20, 40}}));
+  EXPECT_EQ(states["DiscreteGraphics"], (Ranges{{50, 20}}));
+}
+
+}  // namespace
+}  // namespace bw
