@@ -1,0 +1,75 @@
+#include <gtest/gtest.h>
+
+#include <vector>
+
+#include "domains/AbsoluteDomain.h"
+#include "domains/AllDomain.h"
+#include "domains/BootDomain.h"
+#include "domains/DateDomain.h"
+#include "domains/PostInstallDomain.h"
+#include "domains/RangeList.h"
+#include "domains/RelativeTimeDomain.h"
+#include "domains/WallTimeDomain.h"
+#include "domains/WallTimeText.h"
+#include "Support.h"
+
+namespace bw {
+namespace {
+
+using test::DebugCapture;
+using Ranges = std::vector<Range>;
+
+TEST(DomainAnnouncements, WithDebugEachConstructorPrintsItsSelection) {
+  ASSERT_TRUE(test::kProcessZoneSet);
+  DebugCapture capture;
+  RelativeTimeDomain relative(100, 200);
+  WallTimeDomain wall(1'705'273'200'000, 1'705'359'600'999);
+  AbsoluteDomain absolute(AbsRange::rangeWithBoot(test::bootNamed(0xAB), 1'000, 3'000));
+  DateDomain date({2024, 1, 5});
+  AllDomain all;
+  BootDomain boot(std::nullopt);
+  PostInstallDomain postInstall;
+  EXPECT_EQ(capture.text(),
+            "Selecting events from 100 to 200\n"
+            "Selecting events from 2024-01-15 00:00:00 +0100 (1705273200) to 2024-01-16 00:00:00 +0100 "
+            "(1705359600)\n"
+            "Selecting events from 1000 to 3000 in ABABABAB-ABAB-ABAB-ABAB-ABABABABABAB\n"
+            "Selecting events from 2024-01-05\n");
+}
+
+TEST(DomainAnnouncements, WithoutDebugNothingIsPrintedAndDatesHaveNoOffset) {
+  std::ostringstream err;
+  setConsole(nullptr, &err);
+  RelativeTimeDomain relative(100, 200);
+  WallTimeDomain wall(0, 1);
+  DateDomain date({2024, 1, 5});
+  setConsole(nullptr, nullptr);
+  EXPECT_EQ(err.str(), "");
+  EXPECT_EQ(formatWallTime(1'720'000'000'000), "2024-07-03 11:46:40");  // summer time, +0200
+}
+
+TEST(RangeList, SubtractionCutsSplitsAndDropsWhatIsCovered) {
+  struct Case {
+    Ranges a, b, expected;
+  };
+  const Case cases[] = {
+      {{{0, 400}}, {{100, 50}}, {{0, 100}, {150, 250}}},
+      {{{100, 50}}, {{0, 400}}, {}},
+      {{{0, 100}, {200, 100}}, {{50, 200}}, {{0, 50}, {250, 50}}},  // one cut across two
+      {{{0, 100}}, {{0, 10}, {20, 10}, {90, 30}}, {{10, 10}, {30, 60}}},
+      {{{0, 100}, {300, 10}}, {{100, 200}}, {{0, 100}, {300, 10}}},  // touching only
+      {{{0, 100}}, {{50, 0}}, {{0, 100}}},                           // empty cut
+      {{{0, 10}, {20, 10}}, {}, {{0, 10}, {20, 10}}},
+  };
+  for (const Case& c : cases) {
+    EXPECT_EQ(subtractRanges(c.a, c.b), c.expected);
+  }
+}
+
+TEST(RangeList, TotalLengthSumsLengths) {
+  EXPECT_EQ(totalLength({}), 0u);
+  EXPECT_EQ(totalLength({{0, 100}, {150, 250}}), 350u);
+}
+
+}  // namespace
+}  // namespace bw

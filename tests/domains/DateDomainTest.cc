@@ -1,0 +1,95 @@
+#include <gtest/gtest.h>
+
+#include <vector>
+
+#include "domains/DateDomain.h"
+#include "Support.h"
+
+namespace bw {
+namespace {
+
+using test::DebugCapture;
+using test::feed;
+using test::idle;
+using test::zoneChange;
+using Ranges = std::vector<Range>;
+
+// 2024-01-15 in Lagos (+1): 2024-01-14 23:00 UTC to a day later.
+constexpr std::uint64_t kLagosStart = 1'705'273'200'000, kLagosEnd = 1'705'359'600'000;
+// The same day in Harare (+2): an hour earlier.
+constexpr std::uint64_t kHarareStart = 1'705'269'600'000, kHarareEnd = 1'705'356'000'000;
+// Positions run this far behind the wall clock.
+constexpr std::uint64_t kBase = 1'705'260'000'000;
+
+void feedAt(DateDomain& domain, const Record& r, std::uint64_t wallTime) {
+  feed(domain, r, wallTime - kBase, wallTime);
+}
+
+TEST(DateDomain, AZoneChangeFromPlusOneToPlusTwoMovesBothBoundsAnHourEarlier) {
+  ASSERT_TRUE(test::kProcessZoneSet);
+  DebugCapture capture;
+  DateDomain domain({2024, 1, 15});
+  feedAt(domain, zoneChange("WAT", 3600), kLagosStart - 8'200'000);
+  EXPECT_EQ(domain.start(), kLagosStart);
+  EXPECT_EQ(domain.end(), kLagosEnd);
+  feedAt(domain, idle(), kLagosStart - 1'000'000);  // inside the Harare day only
+  feedAt(domain, zoneChange("CAT", 7200), kLagosStart - 999'000);
+  feedAt(domain, zoneChange("CAT", 7200), kLagosStart);  // the same zone again
+  EXPECT_EQ(domain.start(), kHarareStart);
+  EXPECT_EQ(domain.end(), kHarareEnd);
+  EXPECT_EQ(domain.tzName(), "Africa/Harare");
+  feedAt(domain, idle(), kHarareEnd);
+  feedAt(domain, idle(), kHarareEnd + 1'000);  // past the Harare day, inside the Lagos one
+  EXPECT_EQ(domain.ranges(), (Ranges{{12'201'000, 83'800'000}}));
+  EXPECT_EQ(capture.text(),
+            "Selecting events from 2024-01-15\n"
+            "Time zone change! Now zone is Africa/Lagos. Adjusting start/end to 1705273200000-1705359600000\n"
+            "Time zone change! Now zone is Africa/Harare. Adjusting start/end to 1705269600000-1705356000000\n");
+}
+
+TEST(DateDomain, SelectsNothingBeforeTheFirstTimeChange) {
+  DateDomain domain({2024, 1, 15});
+  feedAt(domain, idle(), kLagosStart + 1'000);
+  feedAt(domain, idle(), kLagosStart + 2'000);
+  domain.setLastPosition(kLagosStart + 2'000 - kBase);
+  EXPECT_TRUE(domain.ranges().empty());
+  EXPECT_FALSE(domain.tzSet());
+  EXPECT_EQ(domain.lastTime(), 0u);
+}
+
+TEST(DateDomain, UnknownAbbreviationAtOffsetZeroKeepsEmptyBounds) {
+  DebugCapture capture;
+  DateDomain domain({2024, 1, 15});
+  feedAt(domain, zoneChange("XYZ", 0), kLagosStart + 1'000);
+  feedAt(domain, idle(), kLagosStart + 2'000);
+  domain.setLastPosition(kLagosStart + 2'000 - kBase);
+  EXPECT_TRUE(domain.tzSet());
+  EXPECT_EQ(domain.start(), 0u);
+  EXPECT_EQ(domain.end(), 0u);
+  EXPECT_TRUE(domain.ranges().empty());
+  EXPECT_EQ(capture.text(), "Selecting events from 2024-01-15\n");
+}
+
+TEST(DateDomain, UnknownAbbreviationTakesTheDayFromTheOffsetAcrossAMonthEnd) {
+  DebugCapture capture;
+  DateDomain domain({2024, 1, 31});
+  feed(domain, zoneChange("XYZ", 3600), 0, 1'706'655'000'000);
+  EXPECT_EQ(domain.gmtoff(), 3600);
+  EXPECT_EQ(domain.start(), 1'706'655'600'000u);  // 2024-01-30 23:00 UTC
+  EXPECT_EQ(domain.end(), 1'706'742'000'000u);    // 2024-01-31 23:00 UTC
+  EXPECT_EQ(capture.text(),
+            "Selecting events from 2024-01-31\n"
+            "Time zone change! Now offset is 3600. Adjusting start/end to 1706655600000-1706742000000\n");
+}
+
+TEST(DateDomain, DayEndIsOneCalendarDayLaterInTheProcessZone) {
+  // Tokyo's 2024-03-31 begins at 03-30 15:00 UTC; the process zone (Paris)
+  // springs forward that night, so its calendar day is 23 hours long.
+  DateDomain domain({2024, 3, 31});
+  feed(domain, zoneChange("JST", 32400), 0, 1'711'810'000'000);
+  EXPECT_EQ(domain.start(), 1'711'810'800'000u);
+  EXPECT_EQ(domain.end() - domain.start(), 23u * 3'600'000);
+}
+
+}  // namespace
+}  // namespace bw

@@ -1,0 +1,165 @@
+#include <gtest/gtest.h>
+
+#include <vector>
+
+#include "cli/Options.h"
+#include "domains/AbsoluteDomain.h"
+#include "domains/AllDomain.h"
+#include "domains/BootDomain.h"
+#include "domains/DateDomain.h"
+#include "domains/PostInstallDomain.h"
+#include "domains/RelativeTimeDomain.h"
+#include "domains/WallTimeDomain.h"
+#include "Support.h"
+
+namespace bw {
+namespace {
+
+using test::bootNamed;
+using test::feed;
+using test::idle;
+using test::wakeAt;
+using Ranges = std::vector<Range>;
+
+TEST(AllDomain, SelectsFromZeroToTheLastPositionWhateverTheRecords) {
+  AllDomain domain;
+  feed(domain, idle(), 100);
+  feed(domain, idle(), 500);
+  domain.setLastPosition(500);
+  EXPECT_EQ(domain.ranges(), (Ranges{{0, 500}}));
+}
+
+TEST(RelativeTimeDomain, IncludesRecordsOnBothBounds) {
+  RelativeTimeDomain domain(100, 200);
+  for (std::uint64_t p : {50, 100, 200, 201}) feed(domain, idle(), p);
+  EXPECT_EQ(domain.ranges(), (Ranges{{100, 101}}));
+  EXPECT_FALSE(domain.lastDomain());
+}
+
+// Start 1,030,000 and end 1,100,000 ms of wall time; positions run 999,000
+// ms behind the wall clock, as on one segment.
+TEST(WallTimeDomain, DatesChangesBackToWhereTheClockCrossedTheBounds) {
+  WallTimeDomain domain(1'030'000, 1'100'000);
+  feed(domain, wakeAt(0), 1'000, 1'000'000);
+  feed(domain, wakeAt(0), 61'000, 1'060'000);   // start passed 30 s before
+  feed(domain, wakeAt(0), 161'000, 1'160'000);  // end passed 60 s before
+  EXPECT_EQ(domain.ranges(), (Ranges{{31'000, 70'000}}));
+  EXPECT_EQ(domain.lastTime(), 161'000u);
+}
+
+TEST(WallTimeDomain, RecordsWithoutTheirOwnWallTimeChangeAtTheirPositionAndEndIsIncluded) {
+  WallTimeDomain domain(1'030'000, 1'100'000);
+  feed(domain, idle(), 1'000, 1'000'000);
+  feed(domain, idle(), 61'000, 1'060'000);
+  feed(domain, idle(), 101'000, 1'100'000);  // exactly at end: still inside
+  feed(domain, idle(), 101'001, 1'100'001);
+  EXPECT_EQ(domain.ranges(), (Ranges{{61'000, 40'001}}));
+}
+
+TEST(WallTimeDomain, CrossingNoLaterThanThePreviousRecordChangesAtTheRecord) {
+  WallTimeDomain domain(1'030'000, 1'100'000);
+  // The first record of a walk counts from position 0: a crossing 30 s
+  // before a record at 10 s is not dated back.
+  feed(domain, wakeAt(0), 10'000, 1'060'000);
+  // A clock set back below start leaves at the record itself.
+  feed(domain, wakeAt(0), 20'000, 1'000'000);
+  EXPECT_EQ(domain.ranges(), (Ranges{{10'000, 10'000}}));
+}
+
+TEST(AbsoluteDomain, SelectsAHalfOpenRangeOfOneBoot) {
+  const Uuid a = bootNamed(1), b = bootNamed(2);
+  AbsoluteDomain domain(AbsRange::rangeWithBoot(a, 1'000, 2'000));
+  feed(domain, idle(), 0, 0, {a, 999});
+  feed(domain, idle(), 1, 0, {a, 1'000});
+  feed(domain, idle(), 1'000, 0, {a, 1'999});
+  feed(domain, idle(), 1'001, 0, {a, 2'000});
+  feed(domain, idle(), 1'500, 0, {a, 1'500});
+  feed(domain, idle(), 2'000, 0, {b, 1'500});
+  domain.setLastPosition(2'000);
+  EXPECT_EQ(domain.ranges(), (Ranges{{1, 1'000}, {1'500, 500}}));
+}
+
+TEST(BootDomain, SelectsTheGivenBootOrTheFirstOneSeen) {
+  const Uuid a = bootNamed(1), b = bootNamed(2), c = bootNamed(3);
+  BootDomain given(b), first(std::nullopt);
+  const std::pair<std::uint64_t, Uuid> records[] = {{0, a}, {10, a}, {20, b}, {30, b}, {40, c}};
+  for (auto& [position, boot] : records) {
+    feed(given, idle(), position, 0, {boot, position});
+    feed(first, idle(), position, 0, {boot, position});
+  }
+  EXPECT_EQ(given.ranges(), (Ranges{{20, 20}}));
+  EXPECT_EQ(first.ranges(), (Ranges{{0, 20}}));
+  EXPECT_EQ(first.uuid(), a);
+}
+
+LogStartsV1 logStart(const char* system, const char* last) {
+  LogStartsV1 r;
+  r.setVersion("1");
+  if (system != nullptr) r.setSystemVersion(system);
+  if (last != nullptr) r.setLastSystemVersion(last);
+  return r;
+}
+
+TEST(PostInstallDomain, CoversTheFirstHourAfterAnUpdateOnce) {
+  const Uuid a = bootNamed(1), b = bootNamed(2);
+  PostInstallDomain domain;
+  feed(domain, logStart("21A1", "21A1"), 0, 0, {a, 500});  // same system: no update
+  feed(domain, logStart("21B7", "21A1"), 1'000, 0, {a, 1'000});
+  feed(domain, idle(), 3'601'000, 0, {a, 3'601'000});  // exactly one hour: inside
+  feed(domain, idle(), 3'601'001, 0, {a, 3'601'001});
+  // A later boot with yet another system never reopens it.
+  feed(domain, logStart("21C1", "21B7"), 4'000'000, 0, {b, 0});
+  domain.setLastPosition(4'000'000);
+  EXPECT_EQ(domain.ranges(), (Ranges{{1'000, 3'600'001}}));
+  ASSERT_TRUE(domain.startAbsTime().has_value());
+  EXPECT_EQ(domain.startAbsTime()->time, 1'000u);
+}
+
+TEST(PostInstallDomain, EndsAtTheNextBootAndTreatsAMissingPreviousVersionAsAnUpdate) {
+  const Uuid a = bootNamed(1), b = bootNamed(2);
+  PostInstallDomain domain;
+  feed(domain, idle(), 0, 0, {a, 0});
+  feed(domain, logStart("21B7", nullptr), 100, 0, {a, 100});
+  feed(domain, idle(), 1'800'000, 0, {a, 1'800'000});
+  feed(domain, logStart("21B7", nullptr), 3'600'100, 0, {b, 0});
+  EXPECT_EQ(domain.ranges(), (Ranges{{100, 3'600'000}}));
+}
+
+TEST(Domain, OptionsChooseTheDomainAndItsBounds) {
+  Options options;
+  EXPECT_NE(dynamic_cast<AllDomain*>(Domain::domainWithOptions(options).get()), nullptr);
+
+  options.setDomain_type(kDomainDate);
+  options.setDomain_ymd_year(2024);
+  options.setDomain_ymd_month(2);
+  options.setDomain_ymd_day(29);
+  auto date = Domain::domainWithOptions(options);
+  auto* day = dynamic_cast<DateDomain*>(date.get());
+  ASSERT_NE(day, nullptr);
+  EXPECT_EQ(day->components(), (YearMonthDay{2024, 2, 29}));
+
+  options.setDomain_start(100);
+  options.setDomain_end(200);
+  for (std::uint32_t type : {kDomainWallTime, kDomainRelative}) {
+    options.setDomain_type(type);
+    auto domain = Domain::domainWithOptions(options);
+    auto* relative = dynamic_cast<RelativeTimeDomain*>(domain.get());
+    ASSERT_NE(relative, nullptr);
+    EXPECT_EQ(dynamic_cast<WallTimeDomain*>(relative) != nullptr, type == kDomainWallTime);
+    EXPECT_EQ(relative->start(), 100u);
+    EXPECT_EQ(relative->end(), 200u);
+  }
+}
+
+class BareDomain : public Domain {};
+
+TEST(DomainDeathTest, UnknownTypeAndTheAbstractEventRuleTerminate) {
+  Options options;
+  options.setDomain_type(4);
+  EXPECT_DEATH(Domain::domainWithOptions(options), "unknown domain type");
+  BareDomain bare;
+  EXPECT_DEATH(feed(bare, idle(), 0), "abstract");
+}
+
+}  // namespace
+}  // namespace bw
