@@ -1,0 +1,150 @@
+#include "model/Model.h"
+
+#include <algorithm>
+
+#include "base/Exception.h"
+#include "cli/Options.h"
+#include "store/RecordPool.h"
+#include "summarizers/ModelSummarizers.h"
+
+namespace bw {
+
+Model::Model(std::unique_ptr<Timeline> timeline, std::string systemVersion)
+    : systemVersion_(std::move(systemVersion)), timeline_(std::move(timeline)) {
+  for (auto& [key, summarizer] : makeModelSummarizers()) summarizers_[key] = std::move(summarizer);
+}
+
+Model::~Model() = default;
+
+void Model::processEventsWithDomains(const std::vector<Summarizer*>& domains, const Options& options) {
+  const bool feedSummarizers = options.mode() != kModeDump && options.mode() != kModeShowEvents;
+  std::vector<Summarizer*> all;
+  if (feedSummarizers) {
+    for (auto& [key, summarizer] : summarizers_) all.push_back(summarizer.get());
+  }
+  const std::size_t summarizerCount = all.size();
+  all.insert(all.end(), domains.begin(), domains.end());
+
+  std::uint64_t last = 0;
+  timeline_->enumerateEventsUsingBlock(
+      [&](const Record& event, std::uint64_t position, std::uint64_t wallTime, const AbsTime& absTime, bool&) {
+        for (Summarizer* s : all) s->addEvent(event, position, absTime, wallTime);
+        last = position;
+      });
+  for (auto& [key, summarizer] : summarizers_) summarizer->setLastPosition(last);
+  for (std::size_t i = summarizerCount; i < all.size(); ++i) all[i]->setLastPosition(last);
+}
+
+Summarizer* Model::summarizer(const std::string& key) const {
+  auto it = summarizers_.find(key);
+  return it == summarizers_.end() ? nullptr : it->second.get();
+}
+
+void Model::setSummarizer(const std::string& key, std::unique_ptr<Summarizer> summarizer) {
+  summarizers_[key] = std::move(summarizer);
+}
+
+std::vector<std::string> Model::summarizerKeys() const {
+  std::vector<std::string> keys;
+  for (const auto& [key, s] : summarizers_) keys.push_back(key);
+  std::sort(keys.begin(), keys.end());
+  return keys;
+}
+
+std::vector<Range> intersectRangeLists(const std::vector<Range>& a, const std::vector<Range>& b) {
+  std::vector<Range> result;
+  std::size_t i = 0, j = 0;
+  while (i < a.size() && j < b.size()) {
+    const Range overlap = intersectionRange(a[i], b[j]);
+    if (!(overlap == Range{0, 0})) result.push_back(overlap);
+    if (a[i].end() >= b[j].end()) {
+      ++j;
+    } else {
+      ++i;
+    }
+  }
+  return result;
+}
+
+std::optional<std::vector<Range>> Model::rangesForSubstates(const std::vector<std::string>& keys,
+                                                            const std::optional<std::vector<Range>>& ranges) const {
+  std::optional<std::vector<Range>> result = ranges;
+  for (const std::string& key : keys) {
+    const Summarizer* s = summarizer(key);
+    if (!s) throw Exception(kInvalidArgumentException, "no such summarizer: " + key);
+    result = result ? intersectRangeLists(*result, s->ranges()) : s->ranges();
+  }
+  return result;
+}
+
+std::unique_ptr<Summary> Model::summarize(const std::string& key, const Range& range) const {
+  Summarizer* s = summarizer(key);
+  std::unique_ptr<Summary> summary = s->newSummary();
+  s->summarize(*summary, range, *this);
+  return summary;
+}
+
+std::unique_ptr<Summary> Model::summarize(const std::string& key, const std::vector<Range>& ranges) const {
+  Summarizer* s = summarizer(key);
+  std::unique_ptr<Summary> summary = s->newSummary();
+  for (const Range& r : ranges) s->summarize(*summary, r, *this);
+  return summary;
+}
+
+std::vector<std::unique_ptr<Summary>> Model::summarizeTop(const std::string& key, const std::vector<Range>& ranges,
+                                                          const std::function<bool(const Summary&)>& filter) const {
+  Summarizer* s = summarizer(key);
+  const SummaryComparator compare = s->comparator();
+  std::vector<std::unique_ptr<Summary>> result;
+  for (const Range& r : ranges) {
+    for (const Range& state : s->ranges()) {
+      const Range overlap = intersectionRange(r, state);
+      if (overlap.length == 0) continue;
+      std::unique_ptr<Summary> summary = s->newSummary();
+      s->summarize(*summary, overlap, *this);
+      if (!filter(*summary)) continue;
+      // Binary-search insertion under the reversed comparator: greatest first,
+      // at an equal element's position when there is one.
+      std::size_t low = 0, high = result.size();
+      while (low < high) {
+        const std::size_t mid = (low + high) / 2;
+        const int order = compare ? -compare(*result[mid], *summary) : 0;
+        if (order == 0) {
+          low = high = mid;
+        } else if (order < 0) {
+          low = mid + 1;
+        } else {
+          high = mid;
+        }
+      }
+      result.insert(result.begin() + static_cast<std::ptrdiff_t>(low), std::move(summary));
+    }
+  }
+  return result;
+}
+
+std::uint64_t Model::wallTimeForRelative(std::uint64_t position) const {
+  return timeline_->wallTimeForRelative(position);
+}
+
+std::optional<AbsTime> Model::absoluteTimeForRelative(std::uint64_t position) const {
+  return timeline_->absoluteTimeForRelative(position);
+}
+
+std::vector<AbsRange> Model::absoluteTimeRangesForRelativeRange(const Range& range) const {
+  return timeline_->absoluteRangesForRelativeRange(range);
+}
+
+std::vector<AbsRange> Model::absoluteTimeRangesForRelativeRanges(const std::vector<Range>& ranges) const {
+  return timeline_->absoluteRangesForRelativeRanges(ranges);
+}
+
+std::string describeRanges(const std::optional<std::vector<Range>>& ranges) {
+  if (!ranges) return "(null)";
+  Array items;
+  for (const Range& r : *ranges) items.push_back(Value(format("{%llu, %llu}", static_cast<unsigned long long>(r.location),
+                                                              static_cast<unsigned long long>(r.length))));
+  return describeValue(Value(items));
+}
+
+}  // namespace bw

@@ -1,0 +1,85 @@
+#pragma once
+// Everything known about one system version: the timeline of its boots in
+// sequence and one summarizer of each kind, keyed ("A/C", "Sleep", "Power",
+// ...). A model is built, fed once with every record in timeline order, and
+// then only queried for state ranges and summaries.
+#include <functional>
+#include <map>
+#include <memory>
+#include <optional>
+#include <string>
+#include <unordered_map>
+#include <vector>
+
+#include "base/Range.h"
+#include "model/Summarizer.h"
+#include "time/Timeline.h"
+
+namespace bw {
+
+class Options;
+class RecordPool;
+
+class Model {
+ public:
+  Model(std::unique_ptr<Timeline> timeline, std::string systemVersion);
+  ~Model();
+  Model(const Model&) = delete;
+  Model& operator=(const Model&) = delete;
+
+  // Reads the store the options select and builds one model per system
+  // version. With `processEvents`, each model is fed with the options'
+  // domain and kept only when the domain's ranges, narrowed to the options'
+  // mask states, are not empty.
+  static std::vector<std::unique_ptr<Model>> modelsWithOptions(const Options& options, bool processEvents);
+
+  const std::string& systemVersion() const { return systemVersion_; }
+  const Timeline& timeline() const { return *timeline_; }
+
+  // Feeds every record in timeline order to every summarizer (except in the
+  // dump and event-listing modes) and then to every domain, then tells each
+  // the last position.
+  void processEventsWithDomains(const std::vector<Summarizer*>& domains, const Options& options);
+
+  // The summarizer under `key`, or null.
+  Summarizer* summarizer(const std::string& key) const;
+  // Adds (or replaces) the summarizer under `key`.
+  void setSummarizer(const std::string& key, std::unique_ptr<Summarizer> summarizer);
+  std::vector<std::string> summarizerKeys() const;
+
+  // The positions at which all the keyed states held at once, within
+  // `ranges` (none: anywhere). None only when `keys` is empty and `ranges`
+  // is none. Throws "no such summarizer: KEY" for an unknown key.
+  std::optional<std::vector<Range>> rangesForSubstates(const std::vector<std::string>& keys,
+                                                       const std::optional<std::vector<Range>>& ranges) const;
+
+  std::unique_ptr<Summary> summarize(const std::string& key, const Range& range) const;
+  std::unique_ptr<Summary> summarize(const std::string& key, const std::vector<Range>& ranges) const;
+  // One summary per non-empty overlap of `ranges` with the summarizer's
+  // state ranges, kept when `filter` accepts it, greatest first.
+  std::vector<std::unique_ptr<Summary>> summarizeTop(const std::string& key, const std::vector<Range>& ranges,
+                                                     const std::function<bool(const Summary&)>& filter) const;
+  std::vector<std::unique_ptr<Summary>> sortedPowerSummariesInRanges(const std::vector<Range>& ranges) const;
+
+  std::uint64_t wallTimeForRelative(std::uint64_t position) const;
+  std::optional<AbsTime> absoluteTimeForRelative(std::uint64_t position) const;
+  std::vector<AbsRange> absoluteTimeRangesForRelativeRange(const Range& range) const;
+  std::vector<AbsRange> absoluteTimeRangesForRelativeRanges(const std::vector<Range>& ranges) const;
+
+  // Keeps the records the timeline points at alive as long as the model.
+  void retainRecords(std::shared_ptr<const RecordPool> pool) { records_ = std::move(pool); }
+
+ private:
+  std::string systemVersion_;
+  std::unique_ptr<Timeline> timeline_;
+  std::unordered_map<std::string, std::unique_ptr<Summarizer>> summarizers_;
+  std::shared_ptr<const RecordPool> records_;
+};
+
+// The overlap of two ascending range lists, as a merge walk; never none.
+std::vector<Range> intersectRangeLists(const std::vector<Range>& a, const std::vector<Range>& b);
+
+// The text of a range list in debug lines.
+std::string describeRanges(const std::optional<std::vector<Range>>& ranges);
+
+}  // namespace bw
