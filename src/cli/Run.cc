@@ -6,6 +6,7 @@
 #include "base/Exception.h"
 #include "cli/OptionParser.h"
 #include "cli/Options.h"
+#include "cli/RecordModes.h"
 #include "store/StatsFileList.h"
 
 namespace bw {
@@ -31,6 +32,15 @@ void dispatch(const Options& options) {
   switch (options.mode()) {
     case kModeListFiles:
       listFiles(options);
+      break;
+    case kModeDump:
+      runRecordDump(options);
+      break;
+    case kModeShowEvents:
+      runEventListing(options);
+      break;
+    case kModeShowBattery:
+      runBatteryPlot(options);
       break;
     default:
       notAvailableYet();

@@ -1,0 +1,118 @@
+#include "cli/RecordModes.h"
+
+#include <cstdio>
+#include <cstdlib>
+#include <limits>
+#include <optional>
+
+#include "Records/BatteryChargeLevel.h"
+#include "Records/PowerStateChange.h"
+#include "Records/SleepWake.h"
+#include "base/Console.h"
+#include "cli/ModelRunner.h"
+#include "cli/Options.h"
+#include "domains/Domain.h"
+#include "domains/WallTimeText.h"
+#include "model/Model.h"
+#include "summarizers/BatterySummarizer.h"
+
+namespace bw {
+
+void runRecordDump(const Options& options) {
+  std::ostream& o = out();
+  for (const std::unique_ptr<Model>& model : Model::modelsWithOptions(options, false)) {
+    std::unique_ptr<Domain> domain = Domain::domainWithOptions(options);
+    model->processEventsWithDomains({domain.get()}, options);
+    if (domain->ranges().empty()) continue;
+    std::optional<Uuid> shownBoot;  // starts afresh for every model
+    model->timeline().enumerateEventsInRelativeRanges(
+        domain->ranges(), [&](const Record& event, std::uint64_t, std::uint64_t, const AbsTime& absTime, bool&) {
+          if (shownBoot != absTime.boot) {
+            shownBoot = absTime.boot;
+            o << "===== Boot " << absTime.boot.string() << " =====\n";
+          }
+          o << event.className() << ' ' << describeValue(Value(event.dictionaryRepresentation())) << '\n';
+        });
+  }
+}
+
+void runEventListing(const Options& options) {
+  std::ostream& o = out();
+  runPerModel(options, [&](const Model& model, const std::vector<Range>& ranges) {
+    model.timeline().enumerateEventsInRelativeRanges(
+        ranges, [&](const Record& event, std::uint64_t position, std::uint64_t wallTime, const AbsTime&, bool&) {
+          std::optional<std::string> pretty = event.prettyPrint();
+          const std::string text = pretty ? *pretty : std::string(event.className());
+          const std::string date = formatWallTime(wallTime);
+          if (gDebug) {
+            o << position << '\t' << event.absoluteTime() << '\t' << (event.answersWallTime() ? "*" : " ") << date
+              << '\t' << text << '\n';
+          } else {
+            o << date << '\t' << text << '\n';
+          }
+        });
+  });
+}
+
+namespace {
+
+void plotLine(std::ostream& o, std::uint64_t position, double value) {
+  o << format("%llu\t%.03g\n", static_cast<unsigned long long>(position / 1000), value);
+}
+
+void plotModel(const Model& model) {
+  std::ostream& o = out();
+  const Timeline& timeline = model.timeline();
+  std::uint64_t first = std::numeric_limits<std::uint64_t>::max();
+  std::uint64_t last = 0;
+  timeline.enumerateEventsUsingBlock([&](const Record& event, std::uint64_t position, std::uint64_t,
+                                         const AbsTime&, bool&) {
+    first = std::min(first, position);
+    last = std::max(last, position);
+    if (event.recordClass() == RecordClass::BatteryChargeLevel) {
+      const auto& level = static_cast<const BatteryChargeLevel&>(event);
+      plotLine(o, position, static_cast<double>(level.charge()) * 100 / static_cast<double>(level.maxCharge()));
+    }
+  });
+
+  o << '\n';
+  const auto* battery = dynamic_cast<const BatterySummarizer*>(model.summarizer("Power"));
+  if (battery && first <= last) {
+    for (std::uint64_t p = first; p <= last; p += 1000) {
+      plotLine(o, p, battery->percentChargeAtPosition(p));
+      if (last - p < 1000) break;
+    }
+  }
+
+  o << '\n';
+  timeline.enumerateEventsUsingBlock([&](const Record& event, std::uint64_t position, std::uint64_t,
+                                         const AbsTime&, bool&) {
+    if (event.recordClass() != RecordClass::SleepWake) return;
+    switch (static_cast<const SleepWake&>(event).reason()) {
+      case 0: plotLine(o, position, 100); break;
+      case 2: plotLine(o, position, 50); break;
+      case 1: plotLine(o, position, 0); break;
+      default:
+        // Any other reason means the plot's assumptions are wrong: stop hard.
+        o.flush();
+        std::fprintf(stderr, "brindlewick: unexpected sleep/wake reason %u\n",
+                     static_cast<const SleepWake&>(event).reason());
+        std::abort();
+    }
+  });
+
+  o << '\n';
+  timeline.enumerateEventsUsingBlock([&](const Record& event, std::uint64_t position, std::uint64_t,
+                                         const AbsTime&, bool&) {
+    if (event.recordClass() != RecordClass::PowerStateChange) return;
+    plotLine(o, position, static_cast<const PowerStateChange&>(event).change() != 0 ? 0 : 100);
+  });
+}
+
+}  // namespace
+
+void runBatteryPlot(const Options& options) {
+  runPerModel(options, [](const Model& model, const std::vector<Range>&) { plotModel(model); });
+}
+
+}  // namespace bw

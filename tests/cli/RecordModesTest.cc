@@ -1,0 +1,208 @@
+// The record dump, the event listing and the battery plot of the real binary
+// over a small multi-boot store, compared as whole outputs.
+#include <gtest/gtest.h>
+
+#include <iostream>
+
+#include "cli/RecordModesStore.h"
+#include "support/RunTool.h"
+
+namespace bw {
+namespace {
+
+class RecordModes : public ::testing::Test {
+ protected:
+  static void SetUpTestSuite() {
+    store = new test::TempDir();
+    test::writeRecordModesStore(*store);
+  }
+  static void TearDownTestSuite() { delete store; }
+  test::ToolResult run(std::vector<std::string> args, const std::string& tz = "UTC") {
+    args.insert(args.begin(), {"--from", store->path()});
+    test::RunSettings settings;
+    settings.env["TZ"] = tz;
+    return test::runTool(args, settings);
+  }
+  static test::TempDir* store;
+};
+test::TempDir* RecordModes::store = nullptr;
+
+const char* const kModel1Events =
+    "2024-01-01 00:00:01\tLogStartsV1\t20A1\tAAAAAAAA-0000-0000-0000-000000000001\t\n"
+    "2024-01-01 00:00:02\tTimeChange\n"
+    "2024-01-01 00:00:03\tBatteryChargeLevel\t80\t4000\t5000\t12\t\n"
+    "2024-01-01 00:00:04\tPowerStateChange\tBattery\n"
+    "2024-01-01 00:01:03\tBatteryChargeLevel\t78\t3900\t5000\t12\t\n"
+    "2024-01-01 00:01:10\tSleep\n"
+    "2024-01-01 00:11:11\tDarkWake from Standby (EC.LidOpen)\n"
+    "2024-01-01 00:11:12\tUserIdle\tIdle\n"
+    "2024-01-01 00:15:00\tLogStartsV1\t20A1\tBBBBBBBB-0000-0000-0000-000000000002\tAAAAAAAA-0000-0000-0000-000000000001\n"
+    "2024-01-01 00:15:01\tBatteryChargeLevel\t76\t3800\t5000\t12\t\n"
+    "2024-01-01 00:15:11\tBatteryChargeLevel\t74\t3700\t5000\t12\t\n";
+
+const char* const kBootCHeader1 =
+    "2024-01-01 00:30:00\tLogStartsV1\t21B5\tCCCCCCCC-0000-0000-0000-000000000003\tBBBBBBBB-0000-0000-0000-000000000002\n";
+const char* const kBootCHeader2 =
+    "2024-01-01 01:36:40\tLogStartsV1\t21B5\tCCCCCCCC-0000-0000-0000-000000000003\tBBBBBBBB-0000-0000-0000-000000000002\n";
+
+// The whole timeline is one range that ends at the last record, so each
+// model's last record (the A/C change in boot B, the user activity in boot
+// C) is never listed.
+TEST_F(RecordModes, EventListingShowsEveryModelsRecordsButTheLast) {
+  test::ToolResult r = run({"--show-events"});
+  EXPECT_EQ(r.status, 0);
+  EXPECT_EQ(r.err, "");
+  EXPECT_EQ(r.out, std::string(kModel1Events) + kBootCHeader1 +
+                       "2024-01-01 00:30:00\tDeviceChange\t5\t Wi-Fi (@wlan0)\tconnected\n" + kBootCHeader2);
+}
+
+TEST_F(RecordModes, EventListingWithDebugShowsPositionsTicksAndOwnWallTimes) {
+  test::ToolResult r = run({"--debug", "-b", "20A1", "-R", "3000.667000", "--show-events"});
+  EXPECT_EQ(r.status, 0);
+  EXPECT_EQ(r.out,
+            "3000\t4000\t*2024-01-01 00:00:04 +0000\tPowerStateChange\tBattery\n"
+            "62000\t63000\t 2024-01-01 00:01:03 +0000\tBatteryChargeLevel\t78\t3900\t5000\t12\t\n"
+            "69000\t70000\t*2024-01-01 00:01:10 +0000\tSleep\n"
+            "670000\t71000\t*2024-01-01 00:11:11 +0000\tDarkWake from Standby (EC.LidOpen)\n");
+  EXPECT_EQ(r.err, "Adding files from " + store->path() +
+                       " recursively (periodic files newer than 0001-01-01 00:00:00 +0000)\n"
+                       "Skipping (System Version <20A1>): " + store->path() + "/var/log/com.vexil.launchd.peruser.501/C2.stats\n"
+                       "Skipping (System Version <20A1>): " + store->path() + "/var/log/com.vexil.launchd/C1.stats\n"
+                       "Selecting events from 3000 to 670000\n");
+}
+
+TEST_F(RecordModes, DaySelectionStartsAtTheFirstTimeZoneRecord) {
+  test::ToolResult r = run({"-d", "20240101", "--show-events"});
+  EXPECT_EQ(r.status, 0);
+  std::string expected = kModel1Events;
+  EXPECT_EQ(r.out, expected.substr(expected.find('\n') + 1));
+}
+
+TEST_F(RecordModes, DatesPrintInTheProcesssZoneWhileTheDayFollowsTheRecordedZone) {
+  test::ToolResult r = run({"--debug", "-d", "20240101", "-B", "AAAAAAAA-0000-0000-0000-000000000001",
+                            "--show-events"},
+                           "America/New_York");
+  EXPECT_EQ(r.status, 0);
+  EXPECT_EQ(r.out,
+            "1000\t2000\t*2023-12-31 19:00:02 -0500\tTimeChange\n"
+            "2000\t3000\t 2023-12-31 19:00:03 -0500\tBatteryChargeLevel\t80\t4000\t5000\t12\t\n"
+            "3000\t4000\t*2023-12-31 19:00:04 -0500\tPowerStateChange\tBattery\n"
+            "62000\t63000\t 2023-12-31 19:01:03 -0500\tBatteryChargeLevel\t78\t3900\t5000\t12\t\n"
+            "69000\t70000\t*2023-12-31 19:01:10 -0500\tSleep\n"
+            "670000\t71000\t*2023-12-31 19:11:11 -0500\tDarkWake from Standby (EC.LidOpen)\n");
+  EXPECT_NE(r.err.find("Selecting events from 2024-01-01\n"
+                       "Time zone change! Now zone is UTC. Adjusting start/end to 1704067200000-1704153600000\n"),
+            std::string::npos);
+}
+
+TEST_F(RecordModes, WallClockBoundsSelectAcrossBootsAndAgoFindsNothingOld) {
+  test::ToolResult r = run({"-s", "2024-01-01 00:01:00", "-e", "2024-01-01 00:16:00", "--show-events"});
+  EXPECT_EQ(r.status, 0);
+  std::string expected = kModel1Events;
+  EXPECT_EQ(r.out, expected.substr(expected.find("2024-01-01 00:01:03")));
+  test::ToolResult ago = run({"-A", "1", "--show-events"});
+  EXPECT_EQ(ago.status, 0);
+  EXPECT_EQ(ago.out, "");
+}
+
+TEST_F(RecordModes, ExcludingThePostInstallHourCutsTheUpdatedBootsFirstHour) {
+  test::ToolResult r = run({"-I", "--show-events"});
+  EXPECT_EQ(r.status, 0);
+  std::string expected = kModel1Events;
+  EXPECT_EQ(r.out, expected.substr(expected.find("2024-01-01 00:15:00")) + kBootCHeader2);
+}
+
+TEST_F(RecordModes, MaskStatesNeedFedSummarizersAndUnknownOnesEndTheRun) {
+  // The event listing does not feed the summarizers, so no state ever held.
+  EXPECT_EQ(run({"-S", "Battery", "--show-events"}).out, "");
+  test::ToolResult unknown = run({"-S", "Nope", "--show-battery"});
+  EXPECT_EQ(unknown.status, 70);
+  EXPECT_EQ(unknown.err, "brindlewick: *** uncaught exception NSInvalidArgumentException: no such summarizer: Nope\n");
+}
+
+TEST_F(RecordModes, BatteryPlotPrintsFourSectionsOverTheWholeTimeline) {
+  test::ToolResult r = run({"-B", "BBBBBBBB-0000-0000-0000-000000000002", "-R", "0.1", "--show-battery"});
+  EXPECT_EQ(r.status, 0);
+  EXPECT_EQ(r.out,
+            "1\t76\n11\t74\n"
+            "\n"
+            "0\t76\n1\t76\n2\t75.8\n3\t75.6\n4\t75.4\n5\t75.2\n6\t75\n7\t74.8\n8\t74.6\n9\t74.4\n10\t74.2\n11\t74\n"
+            "\n"
+            "\n"
+            "11\t100\n");
+}
+
+TEST_F(RecordModes, BatteryPlotMapsSleepsAndPowerSourcesAndHonoursMaskStates) {
+  test::ToolResult r = run({"-b", "20A1", "-S", "Battery", "--show-battery"});
+  EXPECT_EQ(r.status, 0);
+  const std::string out = r.out;
+  EXPECT_EQ(out.substr(0, out.find('\n', out.find('\n') + 1) + 1), "2\t80\n62\t78\n");
+  EXPECT_NE(out.find("\n\n69\t100\n670\t50\n\n3\t0\n911\t100\n"), std::string::npos) << out.substr(out.size() - 60);
+  EXPECT_EQ(run({"-b", "21B5", "-S", "Battery", "--show-battery"}).out, "");
+}
+
+TEST_F(RecordModes, DumpPrintsEachRecordsDictionaryUnderItsBoot) {
+  test::ToolResult r = run({"--dump", "-b", "21B5", "-S", "Sleep", "-I"});
+  EXPECT_EQ(r.status, 0);
+  EXPECT_EQ(r.err, "");
+  EXPECT_EQ(r.out,
+            "===== Boot CCCCCCCC-0000-0000-0000-000000000003 =====\n"
+            "LogStartsV1 {\n"
+            "    absoluteTime = 100;\n"
+            "    bootUuid = <cccccccc 00000000 00000000 00000003>;\n"
+            "    lastBootUuid = <bbbbbbbb 00000000 00000000 00000002>;\n"
+            "    lastSystemVersion = 20A1;\n"
+            "    systemVersion = 21B5;\n"
+            "    version = 1;\n"
+            "    wallTime = 1704069000100;\n"
+            "    writer = 1;\n"
+            "}\n"
+            "DeviceChange {\n"
+            "    absoluteTime = 200;\n"
+            "    deviceId = wlan0;\n"
+            "    deviceName = Wi-Fi;\n"
+            "    deviceType = 5;\n"
+            "    nowConnected = 1;\n"
+            "}\n"
+            "LogStartsV1 {\n"
+            "    absoluteTime = 4000000;\n"
+            "    bootUuid = <cccccccc 00000000 00000000 00000003>;\n"
+            "    lastBootUuid = <bbbbbbbb 00000000 00000000 00000002>;\n"
+            "    lastSystemVersion = 20A1;\n"
+            "    systemVersion = 21B5;\n"
+            "    version = 1;\n"
+            "    wallTime = 1704073000000;\n"
+            "    writer = 1;\n"
+            "}\n");
+}
+
+TEST_F(RecordModes, DumpStartsABootHeaderAgainForEveryModelAndSkipsEmptyOnes) {
+  test::ToolResult r = run({"--dump", "-R", "899000.2000"});
+  EXPECT_EQ(r.status, 0);
+  EXPECT_EQ(r.out,
+            "===== Boot BBBBBBBB-0000-0000-0000-000000000002 =====\n"
+            "LogStartsV1 {\n"
+            "    absoluteTime = 500;\n"
+            "    bootUuid = <bbbbbbbb 00000000 00000000 00000002>;\n"
+            "    lastBootUuid = <aaaaaaaa 00000000 00000000 00000001>;\n"
+            "    lastSystemVersion = 20A1;\n"
+            "    systemVersion = 20A1;\n"
+            "    version = 1;\n"
+            "    wallTime = 1704068100500;\n"
+            "    writer = 1;\n"
+            "}\n"
+            "BatteryChargeLevel {\n"
+            "    absoluteTime = 1500;\n"
+            "    charge = 3800;\n"
+            "    cycleCount = 12;\n"
+            "    instantVoltage = 11700;\n"
+            "    maxCharge = 5000;\n"
+            "}\n");
+  test::ToolResult both = run({"--dump", "-R", "0.150"});
+  EXPECT_EQ(both.out.substr(0, both.out.find('\n') + 1), "===== Boot AAAAAAAA-0000-0000-0000-000000000001 =====\n");
+  EXPECT_NE(both.out.find("}\n===== Boot CCCCCCCC-0000-0000-0000-000000000003 =====\nLogStartsV1 {\n"),
+            std::string::npos);
+}
+
+}  // namespace
+}  // namespace bw
