@@ -1,8 +1,6 @@
 #pragma once
-// Records for the summarizer tests, and feeding them at positions of one
-// boot or another.
+// Records for the summarizer tests, fed at positions of one boot or another.
 #include <cstdint>
-#include <optional>
 #include <string>
 
 #include "Records/BatteryChargeLevel.h"
@@ -15,11 +13,7 @@
 
 namespace bw::test {
 
-inline Uuid boot(std::uint8_t n) {
-  Uuid::Bytes bytes{};
-  bytes[15] = n;
-  return Uuid(bytes);
-}
+inline Uuid boot(std::uint8_t n) { return Uuid(Uuid::Bytes{n}); }
 
 inline void feed(Summarizer& s, const Record& r, std::uint64_t position, std::uint8_t bootNumber = 1) {
   s.addEvent(r, position, AbsTime{boot(bootNumber), position}, 0);
@@ -28,7 +22,7 @@ inline void feed(Summarizer& s, const Record& r, std::uint64_t position, std::ui
 inline SleepWake sleepWake(std::uint32_t reason, bool fromStandby = false, const std::string& wakeType = "") {
   SleepWake r;
   r.setReason(reason);
-  if (fromStandby) r.setWakeFromStandby(true);
+  r.setWakeFromStandby(fromStandby);
   if (!wakeType.empty()) r.setWakeType(wakeType);
   return r;
 }
@@ -36,7 +30,7 @@ inline SleepWake sleepWake(std::uint32_t reason, bool fromStandby = false, const
 inline PowerStateChange powerChange(std::uint64_t change, bool fullyCharged = false) {
   PowerStateChange r;
   r.setChange(change);
-  if (fullyCharged) r.setIsFullyCharged(true);
+  r.setIsFullyCharged(fullyCharged);
   return r;
 }
 
@@ -53,11 +47,12 @@ inline DeviceChange device(std::uint32_t type, std::uint32_t connected) {
   return r;
 }
 
-inline BatteryChargeLevel level(std::int64_t charge, std::int64_t maxCharge, std::optional<std::int64_t> mV = {}) {
+// A gauge sample; a voltage of 0 leaves the voltage out.
+inline BatteryChargeLevel level(std::int64_t charge, std::int64_t maxCharge, std::int64_t mV = 0) {
   BatteryChargeLevel r;
   r.setCharge(charge);
   r.setMaxCharge(maxCharge);
-  if (mV) r.setInstantVoltage(*mV);
+  if (mV) r.setInstantVoltage(mV);
   return r;
 }
 
