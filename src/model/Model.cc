@@ -6,6 +6,7 @@
 #include "cli/Options.h"
 #include "store/RecordPool.h"
 #include "summarizers/ModelSummarizers.h"
+#include "summarizers/PowerSummary.h"
 
 namespace bw {
 
@@ -121,6 +122,12 @@ std::vector<std::unique_ptr<Summary>> Model::summarizeTop(const std::string& key
     }
   }
   return result;
+}
+
+std::vector<std::unique_ptr<Summary>> Model::sortedPowerSummariesInRanges(const std::vector<Range>& ranges) const {
+  return summarizeTop("Power", ranges, [](const Summary& s) {
+    return static_cast<const PowerSummary&>(s).avgPowerDenom() > 0.0;
+  });
 }
 
 std::uint64_t Model::wallTimeForRelative(std::uint64_t position) const {
