@@ -117,13 +117,13 @@ void DeviceEvents::deviceChanges(const Boot& boot, RecordSink& sink) {
         }
       }
       if (gpuOn) change(kGpu, last + 700, false, sink);
-      peripherals(run, sink);
+      peripherals(run, first, sink);
     }
     if (run.end == RunEnd::Sleep && wifiOn) change(kWiFiRadio, run.absEnd() - 600, false, sink);
   }
 }
 
-void DeviceEvents::peripherals(const Run& run, RecordSink& sink) {
+void DeviceEvents::peripherals(const Run& run, std::uint64_t first, RecordSink& sink) {
   const std::uint64_t last = run.absEnd() - 5'000;
   const Zone zone = plan_.zoneAt(run.wallStart);
   const std::int64_t local = static_cast<std::int64_t>(run.wallStart) + zone.gmtoff * 1000;
@@ -131,8 +131,8 @@ void DeviceEvents::peripherals(const Run& run, RecordSink& sink) {
   const bool atDesk = plan_.onACAt(run.wallStart + 90'000) && hour >= 7 && hour < 19 && run.duration > 20 * kMinute;
   const bool stays = run.end == RunEnd::Running;
   if (atDesk) {
-    change(kExternalDisplay, run.absStart + 20'000, true, sink);
-    change(kDeskKeyboard, run.absStart + 25'000, true, sink);
+    change(kExternalDisplay, first + 20'000, true, sink);
+    change(kDeskKeyboard, first + 25'000, true, sink);
     if (!stays) {
       change(kDeskKeyboard, last + 500, false, sink);
       change(kExternalDisplay, last + 1'000, false, sink);
@@ -140,7 +140,7 @@ void DeviceEvents::peripherals(const Run& run, RecordSink& sink) {
   }
   const auto visit = [&](const Device& d, double p, std::int64_t minMinutes, std::int64_t maxMinutes) {
     if (run.duration < 20 * kMinute || !rng_.chance(p)) return;
-    const std::uint64_t on = run.absStart + 60'000 + rng_.below(run.duration / 2);
+    const std::uint64_t on = first + 60'000 + rng_.below(run.duration / 2);
     const std::uint64_t off = on + static_cast<std::uint64_t>(rng_.between(minMinutes * kMinute, maxMinutes * kMinute));
     change(d, on, true, sink);
     if (off < last) {

@@ -19,7 +19,7 @@ class DeviceEvents {
 
  private:
   void deviceChanges(const Boot& boot, RecordSink& sink);
-  void peripherals(const Run& run, RecordSink& sink);
+  void peripherals(const Run& run, std::uint64_t first, RecordSink& sink);
   void brightness(const Boot& boot, RecordSink& sink);
   void counters(const Boot& boot, RecordSink& sink);
 

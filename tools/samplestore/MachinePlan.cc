@@ -120,7 +120,8 @@ std::vector<MachinePlan::Session> MachinePlan::planSessions(Random& rng) {
     const Slot* slots = weekend ? kWeekendSlots : kWeekdaySlots;
     for (int k = 0; k < 3; ++k) {
       const Slot& slot = slots[k];
-      if (!(out.empty() && k == 0) && !rng.chance(slot.probability)) continue;
+      // The first day always has its morning and afternoon.
+      if (!(d == 0 && k < 2) && !rng.chance(slot.probability)) continue;
       const auto at = [&](double hour, double spreadMin) {
         const double ms = hour * kHour + rng.around(0, spreadMin) * kMinute;
         return wallOfLocal(day, static_cast<std::int64_t>(ms), zone);
@@ -134,21 +135,6 @@ std::vector<MachinePlan::Session> MachinePlan::planSessions(Random& rng) {
     }
   }
 
-  // The system update: the first session of the update day that is not the
-  // last one ends by installing it.
-  const int updateDay = days_ / 2;
-  for (std::size_t i = 0; i + 1 < out.size(); ++i) {
-    if (out[i].day >= updateDay) {
-      out[i].ending = Session::kUpdate;
-      break;
-    }
-  }
-  // Some nights the laptop is shut down instead of put to sleep.
-  for (std::size_t i = 0; i + 1 < out.size(); ++i) {
-    if (out[i].ending == Session::kSleep && out[i + 1].day != out[i].day && rng.chance(0.1)) {
-      out[i].ending = Session::kShutdown;
-    }
-  }
   // Restarts and short naps (lid closed between meetings) split sessions.
   std::vector<Session> split;
   for (const Session& s : out) {
@@ -156,15 +142,33 @@ std::vector<MachinePlan::Session> MachinePlan::planSessions(Random& rng) {
     if (length > 90 * kMinute && rng.chance(0.35)) {
       const bool restart = rng.chance(0.15);
       const std::uint64_t mid = s.start + static_cast<std::uint64_t>(rng.uniform(0.3, 0.7) * static_cast<double>(length));
-      Session first = s;
-      first.end = mid;
-      first.ending = restart ? Session::kShutdown : Session::kSleep;
-      Session second = s;
-      second.start = mid + static_cast<std::uint64_t>(restart ? rng.between(45'000, 90'000) : rng.between(10 * kMinute, 40 * kMinute));
-      split.push_back(first);
-      split.push_back(second);
-    } else {
-      split.push_back(s);
+      const auto gap = static_cast<std::uint64_t>(restart ? rng.between(45'000, 90'000) : rng.between(10 * kMinute, 40 * kMinute));
+      if (mid + gap + 15 * kMinute < s.end) {
+        Session first = s;
+        first.end = mid;
+        first.ending = restart ? Session::kShutdown : Session::kSleep;
+        Session second = s;
+        second.start = mid + gap;
+        split.push_back(first);
+        split.push_back(second);
+        continue;
+      }
+    }
+    split.push_back(s);
+  }
+  // The system update: the first session of the update day that is not the
+  // last one ends by installing it.
+  const int updateDay = days_ / 2;
+  for (std::size_t i = 0; i + 1 < split.size(); ++i) {
+    if (split[i].day >= updateDay) {
+      split[i].ending = Session::kUpdate;
+      break;
+    }
+  }
+  // Some nights the laptop is shut down instead of put to sleep.
+  for (std::size_t i = 0; i + 1 < split.size(); ++i) {
+    if (split[i].ending == Session::kSleep && split[i + 1].day != split[i].day && rng.chance(0.1)) {
+      split[i].ending = Session::kShutdown;
     }
   }
   return split;
@@ -201,13 +205,15 @@ std::vector<MachinePlan::Episode> MachinePlan::planEpisodes(std::vector<Session>
       ep.boots = true;
       ep.update = i > 0 && sessions[i - 1].ending == Session::kUpdate;
     } else {
-      // Asleep: maintenance wakes now and then, standby after a while.
-      const std::uint64_t standbyDelay = static_cast<std::uint64_t>(onAC ? 8 * kHour : 3 * kHour);
-      std::uint64_t sleepStart = sessions[i - 1].end;
+      // Asleep: maintenance wakes now and then (often on external power,
+      // but only in the first hours), standby after three quiet hours.
+      const std::uint64_t standbyDelay = 3 * kHour;
+      const std::uint64_t asleep = sessions[i - 1].end;
+      std::uint64_t sleepStart = asleep;
       while (true) {
         const std::int64_t interval = onAC ? rng.between(50 * kMinute, 110 * kMinute) : rng.between(150 * kMinute, 300 * kMinute);
         const std::uint64_t wake = sleepStart + static_cast<std::uint64_t>(interval);
-        if (wake + 15 * kMinute > s.start) break;
+        if (wake + 15 * kMinute > s.start || (onAC && wake - asleep > 4 * kHour)) break;
         Episode dark;
         dark.start = wake;
         dark.end = wake + static_cast<std::uint64_t>(rng.between(30'000, 4 * kMinute));

@@ -75,9 +75,11 @@ std::array<std::uint8_t, 16> executableUuidOf(const std::string& name) {
 
 std::vector<Program> makeCatalog(int scale, Random& rng) {
   const int total = std::max(scale, 10);
-  const int apps = std::max(3, total * 12 / 100);
-  const int agents = std::max(2, total * 15 / 100);
-  const int plugins = std::max(1, total * 6 / 100);
+  // A user runs a handful of applications and agents however busy the
+  // machine is; daemons and helper services make up the rest.
+  const int apps = std::clamp(total * 10 / 100, 3, static_cast<int>(std::size(kApps)));
+  const int agents = std::clamp(total * 12 / 100, 2, static_cast<int>(std::size(kAgentWords)));
+  const int plugins = std::max(1, total * 5 / 100);
   const int services = std::max(2, total * 25 / 100);
   const int daemons = std::max(2, total - apps - agents - plugins - services);
   std::vector<Program> out;
