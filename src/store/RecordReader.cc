@@ -94,6 +94,13 @@ Uuid bootOf(const Record* header) { return asHeader(header).bootUUID().value_or(
 }  // namespace
 
 FileRecords readStatsFile(const std::string& path, const Options& options, RecordPool& pool) {
+  MappedFile file(path);
+  if (!file.ok()) return FileRecords();
+  return readStatsData(file.data(), file.size(), path, options, pool);
+}
+
+FileRecords readStatsData(const std::uint8_t* data, std::size_t size, const std::string& path,
+                          const Options& options, RecordPool& pool) {
   FileRecords result;
   const RecordPool::Mark fileStart = pool.mark();
   auto drop = [&](const std::string& why) {
@@ -103,9 +110,7 @@ FileRecords readStatsFile(const std::string& path, const Options& options, Recor
     return result;
   };
 
-  MappedFile file(path);
-  if (!file.ok()) return result;
-  FrameCursor cursor(file.data(), file.size());
+  FrameCursor cursor(data, size);
 
   bool expectingHeader = true;
   bool reportedUnknownType = false;
@@ -176,29 +181,56 @@ FileRecords readStatsFile(const std::string& path, const Options& options, Recor
   return result;
 }
 
-RecordsByBoot readStatsFiles(const std::vector<std::string>& paths, const Options& options) {
-  RecordsByBoot out;
-  std::vector<Uuid> damaged;
-  std::unordered_set<Uuid> writerFiveSeen;
-  for (const std::string& path : paths) {
-    FileRecords file = readStatsFile(path, options, out.pool);
-    if (file.records.empty()) continue;
+namespace {
+
+// Collects the files' results under their boots, in reading order.
+class BootGrouper {
+ public:
+  RecordPool& pool() { return out_.pool; }
+
+  void add(FileRecords file) {
+    if (file.records.empty()) return;
     const Record* first = file.records.front();
     const Uuid boot = bootOf(first);
-    std::vector<Record*>& bootRecords = out.boots[boot];
+    std::vector<Record*>& bootRecords = out_.boots[boot];
     bootRecords.insert(bootRecords.end(), file.records.begin(), file.records.end());
-    if (file.damaged) damaged.push_back(boot);
+    if (file.damaged) damaged_.push_back(boot);
     if (asHeader(first).writer() == 5) {
-      if (!writerFiveSeen.insert(boot).second) {
+      if (!writerFiveSeen_.insert(boot).second) {
         throw Exception(kInternalInconsistencyException, "duplicate boot uuid detected");
       }
     }
   }
-  for (const Uuid& boot : damaged) {
-    std::vector<Record*>& records = out.boots[boot];
-    std::erase_if(records, [](const Record* r) { return r->recordClass() != RecordClass::LogStartsV1; });
+
+  // Damaged boots keep only their headers, so the boot sequence stays whole.
+  RecordsByBoot finish() {
+    for (const Uuid& boot : damaged_) {
+      std::vector<Record*>& records = out_.boots[boot];
+      std::erase_if(records, [](const Record* r) { return r->recordClass() != RecordClass::LogStartsV1; });
+    }
+    return std::move(out_);
   }
-  return out;
+
+ private:
+  RecordsByBoot out_;
+  std::vector<Uuid> damaged_;
+  std::unordered_set<Uuid> writerFiveSeen_;
+};
+
+}  // namespace
+
+RecordsByBoot readStatsFiles(const std::vector<std::string>& paths, const Options& options) {
+  BootGrouper grouper;
+  for (const std::string& path : paths) grouper.add(readStatsFile(path, options, grouper.pool()));
+  return grouper.finish();
+}
+
+RecordsByBoot readStatsBuffers(const std::vector<StatsBuffer>& files, const Options& options) {
+  BootGrouper grouper;
+  for (const StatsBuffer& f : files) {
+    grouper.add(readStatsData(f.data, f.size, f.name, options, grouper.pool()));
+  }
+  return grouper.finish();
 }
 
 RecordsByBoot readAllRecords(const Options& options) {

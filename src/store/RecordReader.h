@@ -8,6 +8,8 @@
 // starting with a header are dropped whole. A file whose decoding fails
 // mid-way leaves its boot only the headers. Records stamped earlier than the
 // latest header of their file are discarded.
+#include <cstddef>
+#include <cstdint>
 #include <string>
 #include <unordered_map>
 #include <vector>
@@ -39,10 +41,27 @@ struct FileRecords {
 // detected" when a boot has two files written by writer 5.
 RecordsByBoot readAllRecords(const Options& options);
 
-// Reads one file into `pool`, applying the per-file rules.
+// Reads one file into `pool`, applying the per-file rules. A file that
+// cannot be opened contributes nothing.
 FileRecords readStatsFile(const std::string& path, const Options& options, RecordPool& pool);
+
+// The same over a file's bytes already in memory; `name` stands for the path
+// in the messages. The records do not point into `data`.
+FileRecords readStatsData(const std::uint8_t* data, std::size_t size, const std::string& name,
+                          const Options& options, RecordPool& pool);
 
 // Reads the given files, in the given order, and groups them by boot.
 RecordsByBoot readStatsFiles(const std::vector<std::string>& paths, const Options& options);
+
+// The bytes of one file in memory, and the name its messages use.
+struct StatsBuffer {
+  const std::uint8_t* data;
+  std::size_t size;
+  std::string name;
+};
+
+// Reads in-memory files, in the given order, and groups them by boot exactly
+// as readStatsFiles does.
+RecordsByBoot readStatsBuffers(const std::vector<StatsBuffer>& files, const Options& options);
 
 }  // namespace bw
