@@ -1,7 +1,9 @@
 #include "domains/WallTimeText.h"
 
 #include <unicode/smpdtfmt.h>
+#include <unicode/timezone.h>
 
+#include <cstdio>
 #include <memory>
 #include <mutex>
 
@@ -9,18 +11,29 @@
 
 namespace bw {
 
-std::string formatWallTime(std::uint64_t ms) {
-  // One formatter per pattern, made on first use in the process's zone and
-  // shared; ICU formatters are not safe to use from two threads at once.
-  static std::mutex lock;
-  static std::unique_ptr<icu::SimpleDateFormat> plain;
-  static std::unique_ptr<icu::SimpleDateFormat> withOffset;
-  std::lock_guard<std::mutex> guard(lock);
-  std::unique_ptr<icu::SimpleDateFormat>& formatter = gDebug ? withOffset : plain;
+namespace {
+
+// Year, month and day of a count of days since 1970-01-01 (proleptic
+// Gregorian).
+void civilFromDays(std::int64_t days, std::int64_t& year, unsigned& month, unsigned& day) {
+  days += 719468;
+  const std::int64_t era = (days >= 0 ? days : days - 146096) / 146097;
+  const unsigned dayOfEra = static_cast<unsigned>(days - era * 146097);
+  const unsigned yearOfEra = (dayOfEra - dayOfEra / 1460 + dayOfEra / 36524 - dayOfEra / 146096) / 365;
+  const unsigned dayOfYear = dayOfEra - (365 * yearOfEra + yearOfEra / 4 - yearOfEra / 100);
+  const unsigned mp = (5 * dayOfYear + 2) / 153;
+  day = dayOfYear - (153 * mp + 2) / 5 + 1;
+  month = mp < 10 ? mp + 3 : mp - 9;
+  year = static_cast<std::int64_t>(yearOfEra) + era * 400 + (month <= 2 ? 1 : 0);
+}
+
+std::string formatWithIcu(std::uint64_t ms, bool withOffset) {
+  static std::unique_ptr<icu::SimpleDateFormat> formatters[2];
+  std::unique_ptr<icu::SimpleDateFormat>& formatter = formatters[withOffset ? 1 : 0];
   if (!formatter) {
     UErrorCode status = U_ZERO_ERROR;
     formatter = std::make_unique<icu::SimpleDateFormat>(
-        icu::UnicodeString(gDebug ? "yyyy-MM-dd HH:mm:ss ZZ" : "yyyy-MM-dd HH:mm:ss"), icu::Locale::getRoot(),
+        icu::UnicodeString(withOffset ? "yyyy-MM-dd HH:mm:ss ZZ" : "yyyy-MM-dd HH:mm:ss"), icu::Locale::getRoot(),
         status);
   }
   icu::UnicodeString text;
@@ -28,6 +41,61 @@ std::string formatWallTime(std::uint64_t ms) {
   std::string result;
   text.toUTF8String(result);
   return result;
+}
+
+}  // namespace
+
+std::string formatWallTime(std::uint64_t ms) {
+  // The text changes once a second at most; listings print many records per
+  // second, so the last second's text is kept. Years 1600 to 9999 are
+  // formatted from the zone's offset by arithmetic, which gives what the
+  // calendar formatter gives there; anything else goes to the formatter.
+  static std::mutex lock;
+  static std::unique_ptr<icu::TimeZone> zone;
+  static std::uint64_t cachedSecond = 0;
+  static int cachedMode = -1;
+  static std::string cachedText;
+  std::lock_guard<std::mutex> guard(lock);
+
+  const bool withOffset = gDebug != 0;
+  const std::uint64_t second = ms / 1000;
+  if (cachedMode == static_cast<int>(withOffset) && cachedSecond == second) return cachedText;
+
+  if (!zone) zone.reset(icu::TimeZone::createDefault());
+  UErrorCode status = U_ZERO_ERROR;
+  std::int32_t rawOffset = 0, dstOffset = 0;
+  zone->getOffset(static_cast<UDate>(ms), false, rawOffset, dstOffset, status);
+  const std::int64_t offsetSeconds = (static_cast<std::int64_t>(rawOffset) + dstOffset) / 1000;
+  const std::int64_t local = static_cast<std::int64_t>(second) + offsetSeconds;
+  std::int64_t days = local / 86400, secondOfDay = local % 86400;
+  if (secondOfDay < 0) {
+    secondOfDay += 86400;
+    --days;
+  }
+  std::int64_t year;
+  unsigned month, day;
+  civilFromDays(days, year, month, day);
+
+  std::string text;
+  if (U_FAILURE(status) || year < 1600 || year > 9999 || (offsetSeconds % 60) != 0) {
+    text = formatWithIcu(ms, withOffset);
+  } else {
+    char buf[48];
+    int n = std::snprintf(buf, sizeof buf, "%04lld-%02u-%02u %02lld:%02lld:%02lld", static_cast<long long>(year),
+                          month, day, static_cast<long long>(secondOfDay / 3600),
+                          static_cast<long long>(secondOfDay / 60 % 60), static_cast<long long>(secondOfDay % 60));
+    if (withOffset) {
+      const std::int64_t minutes = (offsetSeconds < 0 ? -offsetSeconds : offsetSeconds) / 60;
+      std::snprintf(buf + n, sizeof buf - static_cast<std::size_t>(n), " %c%02lld%02lld",
+                    offsetSeconds < 0 ? '-' : '+', static_cast<long long>(minutes / 60),
+                    static_cast<long long>(minutes % 60));
+    }
+    text = buf;
+  }
+  cachedSecond = second;
+  cachedMode = withOffset;
+  cachedText = text;
+  return text;
 }
 
 }  // namespace bw
