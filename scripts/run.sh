@@ -4,4 +4,8 @@ set -euo pipefail
 cd "$(dirname "$0")/.."
 scripts/build.sh >/dev/null
 BUILD_DIR=${BUILD_DIR:-build}
-"$BUILD_DIR"/src/brindlewick --help
+bin="$BUILD_DIR"/src/brindlewick
+# Three days of a simulated laptop, generated once.
+[[ -d sample-store ]] || "$BUILD_DIR"/tools/samplestore/brindlewick-samplestore --days 3 --output sample-store
+# The event listing; until it exists (status 69), the list of stats files.
+"$bin" --from ./sample-store --show-events || { s=$?; ((s == 69)) || exit $s; "$bin" --from ./sample-store --list-files; }

@@ -105,7 +105,7 @@ TEST(SampleStoreGenerator, LargePresetIsAMonthAndExplicitOptionsWin) {
   EXPECT_EQ(snapshot(dir / "s"), snapshot(dir / "t"));
 }
 
-TEST(WallClock, CivilDaysWeekdaysAndYearDays) {
+TEST(SampleStoreWallClock, CivilDaysWeekdaysAndYearDays) {
   EXPECT_EQ(daysFromCivil(1970, 1, 1), 0);
   EXPECT_EQ(civilFromDays(0).weekday, 3);  // a Thursday
   EXPECT_EQ(daysFromCivil(2024, 2, 5), 19758);
@@ -123,7 +123,7 @@ TEST(WallClock, CivilDaysWeekdaysAndYearDays) {
   EXPECT_EQ(wallOfLocal(19758, 0, Zone{"PST", -8 * 3600}), 1'707'120'000'000u);
 }
 
-TEST(WallClock, SavingTimeSwitchesOnTheRightSundays) {
+TEST(SampleStoreWallClock, SavingTimeSwitchesOnTheRightSundays) {
   const auto& table = zoneTable();
   const auto find = [&](const char* name) {
     return *std::find_if(table.begin(), table.end(), [&](const ZoneRule& r) { return std::string(r.standard) == name; });
@@ -143,7 +143,7 @@ TEST(WallClock, SavingTimeSwitchesOnTheRightSundays) {
   EXPECT_STREQ(zoneAt(find("PST"), 1'710'064'800'000).name, "PDT");
 }
 
-TEST(Random, MappingsStayInRangeAndStreamsDiffer) {
+TEST(SampleStoreRandom, MappingsStayInRangeAndStreamsDiffer) {
   Random rng(42);
   bool low = false, high = false;
   for (int i = 0; i < 10'000; ++i) {
@@ -166,7 +166,7 @@ TEST(Random, MappingsStayInRangeAndStreamsDiffer) {
 }
 
 // Plans for many seeds: the invariants the record generators rely on.
-TEST(MachinePlan, RunsAlternateWithSleepsAndStatesStayInsideRuns) {
+TEST(SampleStorePlan, RunsAlternateWithSleepsAndStatesStayInsideRuns) {
   for (std::uint64_t seed = 1; seed <= 25; ++seed) {
     SCOPED_TRACE("seed " + std::to_string(seed));
     const MachinePlan plan(12, seed);

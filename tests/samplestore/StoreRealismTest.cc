@@ -4,8 +4,8 @@
 // laptop's week brings.
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <map>
-#include <regex>
 #include <set>
 
 #include "Records/BatteryChargeLevel.h"
@@ -127,13 +127,22 @@ TEST(SampleStoreRealism, ProcessRecordsFormConsistentLivesAndFamilies) {
   }
   for (std::int64_t s : {-3, -2, -1, 0}) EXPECT_TRUE(statuses.count(s)) << "exit status " << s;
   EXPECT_TRUE(std::any_of(statuses.begin(), statuses.end(), [](std::int64_t s) { return s > 0; }));
-  // Names that the job-name cleaning has to deal with.
-  const std::regex uuidSuffix(R"(.*\.[0-9A-F]{8}-[0-9A-F]{4}-[0-9A-F]{4}-[0-9A-F]{4}-[0-9A-F]{12})");
-  const std::regex numberSuffix(R"(.*\.[0-9]+)");
-  const std::regex launchServices(R"(\[0x[0-9a-f]+-0x[0-9a-f]+\]\..*)");
-  for (const std::regex* pattern : {&uuidSuffix, &numberSuffix, &launchServices}) {
-    EXPECT_TRUE(std::any_of(names.begin(), names.end(), [&](const std::string& n) { return std::regex_match(n, *pattern); }));
-  }
+  // Names that the job-name cleaning has to deal with: a trailing dot and an
+  // upper-case UUID, a trailing dot and digits, a leading launch-services slot.
+  const auto uuidSuffix = [](const std::string& n) {
+    if (n.size() < 38 || n[n.size() - 37] != '.') return false;
+    const std::string tail = n.substr(n.size() - 36);
+    return Uuid::parse(tail).has_value() && tail == Uuid::parse(tail)->string();
+  };
+  const auto numberSuffix = [](const std::string& n) {
+    const std::size_t dot = n.rfind('.');
+    return dot != std::string::npos && dot + 1 < n.size() &&
+           std::all_of(n.begin() + static_cast<std::ptrdiff_t>(dot) + 1, n.end(), [](char ch) { return ch >= '0' && ch <= '9'; });
+  };
+  const auto launchServices = [](const std::string& n) { return n.rfind("[0x", 0) == 0 && n.find("-0x") < n.find("]."); };
+  EXPECT_TRUE(std::any_of(names.begin(), names.end(), uuidSuffix));
+  EXPECT_TRUE(std::any_of(names.begin(), names.end(), numberSuffix));
+  EXPECT_TRUE(std::any_of(names.begin(), names.end(), launchServices));
 }
 
 TEST(SampleStoreRealism, BatteryChargesOnExternalPowerAndDrainsOnBattery) {
