@@ -72,13 +72,68 @@ inline bool skipField(CodedInputStream& in, std::uint64_t key) {
   return WFL::SkipMessage(&in) && in.LastTagWas(WFL::MakeTag(0, WFL::WIRETYPE_END_GROUP));
 }
 
+// Reads a varint as the library does (at most ten bytes, bits beyond 64
+// dropped), inline while the buffer surely holds all of it: the library's
+// own inline path takes one-byte varints only, and records are mostly wider
+// numbers.
+inline bool readVarint(CodedInputStream& in, std::uint64_t* value) {
+  const void* data;
+  int size;
+  in.GetDirectBufferPointerInline(&data, &size);
+  const auto* p = static_cast<const std::uint8_t*>(data);
+  if (size >= 10 || (size > 0 && p[size - 1] < 0x80)) {
+    std::uint64_t result = 0;
+    for (int i = 0; i < 10; ++i) {
+      result |= static_cast<std::uint64_t>(p[i] & 0x7F) << (7 * i);
+      if (p[i] < 0x80) {
+        *value = result;
+        return in.Skip(i + 1);
+      }
+    }
+    return false;
+  }
+  return in.ReadVarint64(value);
+}
+
+// Reads a length-delimited string or bytes value, copied straight from the
+// buffer when all of it is there. As in the library, the length is the low
+// 32 bits of its varint and fails from 2^31 on.
+inline bool readLengthDelimited(CodedInputStream& in, std::string* v) {
+  std::uint64_t raw;
+  if (!readVarint(in, &raw)) return false;
+  const std::uint32_t length = static_cast<std::uint32_t>(raw);
+  if (length > static_cast<std::uint32_t>(INT32_MAX)) return false;
+  const void* data;
+  int size;
+  in.GetDirectBufferPointerInline(&data, &size);
+  if (length <= static_cast<std::uint32_t>(size)) {
+    v->assign(static_cast<const char*>(data), length);
+    return in.Skip(static_cast<int>(length));
+  }
+  return in.ReadString(v, static_cast<int>(length));
+}
+
 template <FieldKind K>
 struct Codec;
 
+// A varint field: the 64-bit value narrowed (32-bit kinds keep the low
+// bits), zigzag-decoded for sint64, or tested against 0 for bool, as the
+// library reads them.
 template <class T, WFL::FieldType kType>
 struct VarintCodec {
   using Type = T;
-  static bool read(CodedInputStream& in, T* v) { return WFL::ReadPrimitive<T, kType>(&in, v); }
+  static bool read(CodedInputStream& in, T* v) {
+    std::uint64_t raw;
+    if (!readVarint(in, &raw)) return false;
+    if constexpr (kType == WFL::TYPE_SINT64) {
+      *v = WFL::ZigZagDecode64(raw);
+    } else if constexpr (kType == WFL::TYPE_BOOL) {
+      *v = raw != 0;
+    } else {
+      *v = static_cast<T>(raw);
+    }
+    return true;
+  }
   static std::uint64_t hash(T v) { return static_cast<std::uint64_t>(v) * kHashMultiplier; }
 };
 
@@ -143,7 +198,7 @@ std::string stringFromValue(const Value& v);
 template <>
 struct Codec<FieldKind::String> {
   using Type = std::string;
-  static bool read(CodedInputStream& in, std::string* v) { return WFL::ReadString(&in, v); }
+  static bool read(CodedInputStream& in, std::string* v) { return readLengthDelimited(in, v); }
   static void write(int n, const std::string& v, CodedOutputStream& out) { WFL::WriteString(n, v, &out); }
   static std::size_t size(int n, const std::string& v) {
     return WFL::TagSize(n, WFL::TYPE_STRING) + WFL::StringSize(v);
@@ -155,7 +210,7 @@ struct Codec<FieldKind::String> {
 template <>
 struct Codec<FieldKind::Bytes> {
   using Type = std::string;
-  static bool read(CodedInputStream& in, std::string* v) { return WFL::ReadBytes(&in, v); }
+  static bool read(CodedInputStream& in, std::string* v) { return readLengthDelimited(in, v); }
   static void write(int n, const std::string& v, CodedOutputStream& out) { WFL::WriteBytes(n, v, &out); }
   static std::size_t size(int n, const std::string& v) {
     return WFL::TagSize(n, WFL::TYPE_BYTES) + WFL::BytesSize(v);
@@ -259,6 +314,9 @@ constexpr bool strictlyAscending(const FieldInfo (&fields)[n]) {
     if (!::bw::record_codec::readElement(input, name##_)) return false; \
     break;
 
+// Records stay in memory for the whole run: no spare element capacity.
+#define BW_CODEC_SHRINK_REPEATED(name, Name, number, Element, key) name##_.shrink_to_fit();
+
 #define BW_CODEC_WRITE(name, Name, number, kind, presence, key)                                     \
   if constexpr (BW_CODEC_REQUIRED(presence) && ::bw::record_codec::isObject(BW_CODEC_KIND(kind))) { \
     if (!hasBit(kBit_##name))                                                                       \
@@ -335,10 +393,13 @@ constexpr bool strictlyAscending(const FieldInfo (&fields)[n]) {
 #define BW_RECORD_DEFINE(Class, FIELDS, REPEATED)                                                  \
   bool Class::readFrom(google::protobuf::io::CodedInputStream& input) {                            \
     for (;;) {                                                                                     \
-      if (::bw::record_codec::atEnd(input)) return true;                                           \
-      std::uint64_t key;                                                                           \
-      if (!input.ReadVarint64(&key)) return false;                                                 \
-      if ((key & 7) == ::bw::record_codec::WFL::WIRETYPE_END_GROUP) return true;                   \
+      std::uint64_t key = ::bw::record_codec::WFL::WIRETYPE_END_GROUP;                             \
+      if (!::bw::record_codec::atEnd(input) && !::bw::record_codec::readVarint(input, &key))       \
+        return false;                                                                              \
+      if ((key & 7) == ::bw::record_codec::WFL::WIRETYPE_END_GROUP) {                              \
+        REPEATED(BW_CODEC_SHRINK_REPEATED)                                                         \
+        return true;                                                                               \
+      }                                                                                            \
       switch (key >> 3) {                                                                          \
         FIELDS(BW_CODEC_READ_CASE)                                                                 \
         REPEATED(BW_CODEC_READ_REPEATED_CASE)                                                      \

@@ -50,14 +50,13 @@ class FrameCursor {
   // past the end is a decoding failure when the body has a class, and the
   // end of the data when it has none.
   std::optional<std::pair<const std::uint8_t*, std::size_t>> nextBody(bool hasClass) {
-    google::protobuf::io::CodedInputStream input(data_ + pos_, static_cast<int>(std::min<std::size_t>(size_ - pos_, INT32_MAX)));
+    const bool bytesLeft = pos_ < size_;
     std::uint32_t length = 0;
-    if (!input.ReadVarint32(&length)) {
-      if (pos_ < size_ && hasClass) throw DecodeFailure{"malformed message length"};
+    if (!readLength(&length)) {
+      if (bytesLeft && hasClass) throw DecodeFailure{"malformed message length"};
       pos_ = size_;
       return std::nullopt;
     }
-    pos_ += static_cast<std::size_t>(input.CurrentPosition());
     if (length > size_ - pos_) {
       if (hasClass) throw DecodeFailure{"message length runs past the end of the data"};
       pos_ = size_;
@@ -69,12 +68,30 @@ class FrameCursor {
   }
 
  private:
+  // A body length as the protocol-buffer stream reads it: a varint of at
+  // most ten bytes, kept to its low 32 bits.
+  bool readLength(std::uint32_t* length) {
+    std::uint64_t value = 0;
+    for (unsigned i = 0; i < 10; ++i) {
+      if (pos_ >= size_) return false;
+      const std::uint8_t byte = data_[pos_++];
+      value |= static_cast<std::uint64_t>(byte & 0x7F) << (7 * i);
+      if (byte < 0x80) {
+        *length = static_cast<std::uint32_t>(value);
+        return true;
+      }
+    }
+    return false;
+  }
+
   const std::uint8_t* data_;
   std::size_t size_;
   std::size_t pos_ = 0;
 };
 
 Record* decodeBody(RecordClass c, const std::uint8_t* body, std::size_t length, RecordPool& pool) {
+  // The coded stream counts in int: a longer body cannot be read.
+  if (length > static_cast<std::size_t>(INT32_MAX)) throw DecodeFailure{"message too long"};
   Record* record = pool.create(c);
   google::protobuf::io::CodedInputStream input(body, static_cast<int>(length));
   if (!record->readFrom(input)) {
