@@ -19,6 +19,7 @@
 #include "Records/SleepWake.h"
 #include "Records/TimeChange.h"
 #include "Records/UserIdle.h"
+#include "MachinePlan.h"
 #include "StoreFixture.h"
 
 namespace bw::samplestore {
@@ -221,6 +222,35 @@ TEST(SampleStoreRealism, AWeekBringsEveryKindOfPowerAndDeviceEvent) {
   // announced, by a date record or by the clock record of a boot.
   for (std::uint32_t day = 36; day < 35u + static_cast<std::uint32_t>(store.config.days); ++day) {
     EXPECT_TRUE(days.count(day)) << "day " << day;
+  }
+}
+
+TEST(SampleStoreRealism, ZoneChangesAreAnnouncedAtOnceOrAtTheNextWake) {
+  const auto& store = sharedStore();
+  const MachinePlan plan(store.config.days, store.config.seed);
+  std::vector<const TimeChange*> clocks;
+  std::vector<std::uint64_t> wakes;  // wall times the machine came up
+  for (const auto& records : store.boots) {
+    wakes.push_back(records.front()->wallTime());
+    for (const SleepWake* s : only<SleepWake>(records)) {
+      if (s->reason() != 0) wakes.push_back(s->wallTime());
+    }
+    for (const TimeChange* t : only<TimeChange>(records)) {
+      // Every clock record names the zone the laptop is in.
+      const Zone zone = plan.zoneAt(t->wallTime());
+      EXPECT_EQ(t->zoneName(), zone.name);
+      EXPECT_EQ(t->gmtoff(), zone.gmtoff);
+      clocks.push_back(t);
+    }
+  }
+  ASSERT_FALSE(plan.zoneSwitches().empty());
+  for (std::uint64_t at : plan.zoneSwitches()) {
+    const auto clock = std::find_if(clocks.begin(), clocks.end(), [&](const TimeChange* t) { return t->wallTime() >= at; });
+    ASSERT_NE(clock, clocks.end());
+    if ((*clock)->wallTime() == at) continue;  // awake when it happened
+    const auto wake = std::lower_bound(wakes.begin(), wakes.end(), at);
+    ASSERT_NE(wake, wakes.end());
+    EXPECT_LE((*clock)->wallTime(), *wake + 2'000) << "switch at " << at;
   }
 }
 
