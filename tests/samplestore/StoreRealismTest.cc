@@ -129,7 +129,7 @@ TEST(SampleStoreRealism, ProcessRecordsFormConsistentLivesAndFamilies) {
   for (std::int64_t s : {-3, -2, -1, 0}) EXPECT_TRUE(statuses.count(s)) << "exit status " << s;
   EXPECT_TRUE(std::any_of(statuses.begin(), statuses.end(), [](std::int64_t s) { return s > 0; }));
   // Names that the job-name cleaning has to deal with: a trailing dot and an
-  // upper-case UUID, a trailing dot and digits, a leading launch-services slot.
+  // upper-case UUID, a trailing dot and digits, a leading launcher slot.
   const auto uuidSuffix = [](const std::string& n) {
     if (n.size() < 38 || n[n.size() - 37] != '.') return false;
     const std::string tail = n.substr(n.size() - 36);
@@ -140,10 +140,10 @@ TEST(SampleStoreRealism, ProcessRecordsFormConsistentLivesAndFamilies) {
     return dot != std::string::npos && dot + 1 < n.size() &&
            std::all_of(n.begin() + static_cast<std::ptrdiff_t>(dot) + 1, n.end(), [](char ch) { return ch >= '0' && ch <= '9'; });
   };
-  const auto launchServices = [](const std::string& n) { return n.rfind("[0x", 0) == 0 && n.find("-0x") < n.find("]."); };
+  const auto launcherSlot = [](const std::string& n) { return n.rfind("[0x", 0) == 0 && n.find("-0x") < n.find("]."); };
   EXPECT_TRUE(std::any_of(names.begin(), names.end(), uuidSuffix));
   EXPECT_TRUE(std::any_of(names.begin(), names.end(), numberSuffix));
-  EXPECT_TRUE(std::any_of(names.begin(), names.end(), launchServices));
+  EXPECT_TRUE(std::any_of(names.begin(), names.end(), launcherSlot));
 }
 
 TEST(SampleStoreRealism, BatteryChargesOnExternalPowerAndDrainsOnBattery) {

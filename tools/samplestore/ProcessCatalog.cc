@@ -21,14 +21,14 @@ const char* const kAgentWords[] = {
     "widget", "dock", "menu",    "desktop", "preview", "input", "speech", "accounts",
 };
 
-struct AppSpec {
+struct AppModel {
   const char* name;
-  const char* bundle;    // reverse-domain identifier
+  const char* identifier;  // reverse-domain name
   double cpuWeight;
   std::uint64_t residentMB;
-  bool launchServicesName;  // recorded under its launch-services label
+  bool slotLabel;  // recorded under the launcher's slot label
 };
-const AppSpec kApps[] = {
+const AppModel kApps[] = {
     {"Harbor Browser", "com.harbor.browser", 0.22, 700, false},
     {"Tidepool Mail", "com.tidepool.mail", 0.05, 320, true},
     {"Inkwell", "org.inkwell.editor", 0.04, 260, false},
@@ -47,13 +47,13 @@ const AppSpec kApps[] = {
     {"Kestrel Files", "com.kestrel.files", 0.02, 130, false},
 };
 
-struct ServiceSpec {
+struct ServiceModel {
   const char* suffix;
   double cpuShare;  // of the owner's weight
   bool uuidSuffix;
   bool numberSuffix;
 };
-const ServiceSpec kServices[] = {
+const ServiceModel kServices[] = {
     {"Renderer", 0.8, true, false},   {"Networking", 0.2, false, false}, {"Thumbnailer", 0.3, false, true},
     {"Autosave", 0.05, false, true},  {"Spellcheck", 0.05, false, false}, {"Decoder", 0.5, true, false},
 };
@@ -109,29 +109,29 @@ std::vector<Program> makeCatalog(int scale, Random& rng) {
     out.push_back(std::move(p));
   }
   std::vector<int> appIndex;
-  std::map<int, std::string> bundles;
+  std::map<int, std::string> identifiers;
   for (int i = 0; i < apps; ++i) {
     const int n = static_cast<int>(std::size(kApps));
-    const AppSpec& spec = kApps[i % n];
+    const AppModel& app = kApps[i % n];
     Program p;
-    p.displayName = std::string(spec.name) + (i < n ? "" : " " + std::to_string(i / n + 1));
-    std::string bundle = std::string(spec.bundle) + round(i, n);
-    if (spec.launchServicesName) {
-      // Launched through the launch services: the label carries its slot.
+    p.displayName = std::string(app.name) + (i < n ? "" : " " + std::to_string(i / n + 1));
+    std::string identifier = std::string(app.identifier) + round(i, n);
+    if (app.slotLabel) {
+      // Started by the application launcher: the label begins with its slot.
       char prefix[40];
       std::snprintf(prefix, sizeof prefix, "[0x0-0x%x].", 0x1a01a + i * 0x3003);
-      p.name = prefix + bundle;
+      p.name = prefix + identifier;
     } else {
       p.name = p.displayName;
     }
     p.role = Role::App;
     p.uid = 501;
-    p.cpuWeight = spec.cpuWeight * rng.uniform(0.7, 1.3);
+    p.cpuWeight = app.cpuWeight * rng.uniform(0.7, 1.3);
     p.wakeRate = rng.uniform(5, 120);
-    p.residentMB = spec.residentMB;
+    p.residentMB = app.residentMB;
     p.gui = true;
     appIndex.push_back(static_cast<int>(out.size()));
-    bundles[static_cast<int>(out.size())] = bundle;
+    identifiers[static_cast<int>(out.size())] = identifier;
     out.push_back(std::move(p));
   }
   for (int i = 0; i < services; ++i) {
@@ -139,19 +139,19 @@ std::vector<Program> makeCatalog(int scale, Random& rng) {
     const bool forDaemon = i % 5 == 4;
     const int owner = forDaemon ? static_cast<int>(rng.below(static_cast<std::uint64_t>(daemons)))
                                 : appIndex[static_cast<std::size_t>(i) % appIndex.size()];
-    const ServiceSpec& spec = kServices[static_cast<std::size_t>(i / 2) % std::size(kServices)];
+    const ServiceModel& service = kServices[static_cast<std::size_t>(i / 2) % std::size(kServices)];
     const Program& o = out[static_cast<std::size_t>(owner)];
     Program p;
-    p.name = forDaemon ? "com.vexil." + o.name + ".worker" : bundles[owner] + "." + spec.suffix;
+    p.name = forDaemon ? "com.vexil." + o.name + ".worker" : identifiers[owner] + "." + service.suffix;
     p.role = Role::Service;
     p.owner = owner;
     p.uid = o.uid;
-    p.cpuWeight = o.cpuWeight * spec.cpuShare;
+    p.cpuWeight = o.cpuWeight * service.cpuShare;
     p.wakeRate = rng.uniform(1, 40);
     p.residentMB = std::max<std::uint64_t>(12, o.residentMB / 3);
-    p.gui = !forDaemon && spec.cpuShare >= 0.5;
-    p.uuidSuffix = !forDaemon && spec.uuidSuffix;
-    p.numberSuffix = forDaemon || spec.numberSuffix;
+    p.gui = !forDaemon && service.cpuShare >= 0.5;
+    p.uuidSuffix = !forDaemon && service.uuidSuffix;
+    p.numberSuffix = forDaemon || service.numberSuffix;
     out.push_back(std::move(p));
   }
   for (int i = 0; i < plugins; ++i) {

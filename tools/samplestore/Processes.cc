@@ -130,8 +130,8 @@ void Processes::planInstances(const Boot& boot) {
 }
 
 void Processes::planOwned(const Boot& boot, int program, const std::vector<int>& owners) {
-  const Program& spec = catalog_[static_cast<std::size_t>(program)];
-  const bool plugin = spec.role == Role::Plugin;
+  const Program& model = catalog_[static_cast<std::size_t>(program)];
+  const bool plugin = model.role == Role::Plugin;
   const std::uint64_t last = boot.lastAbs();
   for (int o : owners) {
     const std::uint64_t ownerStart = instances_[static_cast<std::size_t>(o)].start;
@@ -141,17 +141,17 @@ void Processes::planOwned(const Boot& boot, int program, const std::vector<int>&
     while (t + 10'000 < std::min(ownerEnd, last)) {
       Instance p;
       p.program = program;
-      p.name = spec.name;
-      if (spec.uuidSuffix) p.name += "." + rng_.uuid().string();
-      if (spec.numberSuffix) p.name += "." + std::to_string(rng_.between(100, 99'999));
-      p.displayName = spec.displayName;
-      p.executableUuid = spec.executableUuid;
-      p.uid = spec.uid;
+      p.name = model.name;
+      if (model.uuidSuffix) p.name += "." + rng_.uuid().string();
+      if (model.numberSuffix) p.name += "." + std::to_string(rng_.between(100, 99'999));
+      p.displayName = model.displayName;
+      p.executableUuid = model.executableUuid;
+      p.uid = model.uid;
       p.start = t;
-      p.cpuWeight = spec.cpuWeight;
-      p.wakeRate = spec.wakeRate;
-      p.residentMB = spec.residentMB;
-      p.gui = spec.gui;
+      p.cpuWeight = model.cpuWeight;
+      p.wakeRate = model.wakeRate;
+      p.residentMB = model.residentMB;
+      p.gui = model.gui;
       // Services are started by launchd on the owner's behalf; plug-ins by the owner.
       p.parent = plugin ? o : kLaunchd;
       p.responsible = o;
