@@ -1,7 +1,6 @@
 #include "store/StatsFileWriter.h"
 
 #include <google/protobuf/io/coded_stream.h>
-#include <google/protobuf/io/zero_copy_stream_impl_lite.h>
 
 #include <cstdio>
 
@@ -20,11 +19,13 @@ void StatsFileWriter::append(const Record& record) { append(record, recordTypeFo
 
 void StatsFileWriter::append(const Record& record, std::uint64_t type) {
   const std::string body = record.serialize();
-  google::protobuf::io::StringOutputStream stream(&bytes_);
-  google::protobuf::io::CodedOutputStream output(&stream);
-  output.WriteVarint64(type << 3 | 2);
-  output.WriteVarint32(static_cast<std::uint32_t>(body.size()));
-  output.WriteRaw(body.data(), static_cast<int>(body.size()));
+  // The key and length go through a small buffer: a stream over the whole
+  // file's bytes would grow and trim them on every record.
+  std::uint8_t prefix[2 * google::protobuf::io::CodedOutputStream::kMaxVarintBytes];
+  std::uint8_t* end = google::protobuf::io::CodedOutputStream::WriteVarint64ToArray(type << 3 | 2, prefix);
+  end = google::protobuf::io::CodedOutputStream::WriteVarint32ToArray(static_cast<std::uint32_t>(body.size()), end);
+  bytes_.append(reinterpret_cast<const char*>(prefix), static_cast<std::size_t>(end - prefix));
+  bytes_ += body;
 }
 
 bool StatsFileWriter::writeTo(const std::string& path) const {
