@@ -21,7 +21,7 @@ void StatsFileWriter::append(const Record& record, std::uint64_t type) {
   const std::string body = record.serialize();
   // The key and length go through a small buffer: a stream over the whole
   // file's bytes would grow and trim them on every record.
-  std::uint8_t prefix[2 * google::protobuf::io::CodedOutputStream::kMaxVarintBytes];
+  std::uint8_t prefix[20];  // two varints of at most ten bytes
   std::uint8_t* end = google::protobuf::io::CodedOutputStream::WriteVarint64ToArray(type << 3 | 2, prefix);
   end = google::protobuf::io::CodedOutputStream::WriteVarint32ToArray(static_cast<std::uint32_t>(body.size()), end);
   bytes_.append(reinterpret_cast<const char*>(prefix), static_cast<std::size_t>(end - prefix));
