@@ -15,7 +15,6 @@ namespace bw::samplestore {
 StoreConfig largePreset() {
   StoreConfig config;
   config.days = 30;
-  config.scale = 200;
   return config;
 }
 

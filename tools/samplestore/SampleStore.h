@@ -20,7 +20,7 @@ namespace bw::samplestore {
 struct StoreConfig {
   int days = 3;
   std::uint64_t seed = 1;
-  int scale = 200;     // processes running at once, roughly
+  int scale = 350;     // processes running at once, roughly
   std::string output;  // must be absent or an empty directory
 };
 

@@ -19,7 +19,7 @@ void usage(std::FILE* out) {
       "  -o, --output DIR   where to write the store (absent or empty)\n"
       "  -d, --days N       days to simulate (default 3)\n"
       "  -s, --seed S       seed; the same seed gives the same bytes (default 1)\n"
-      "  -p, --scale P      processes running at once, roughly (default 200)\n"
+      "  -p, --scale P      processes running at once, roughly (default 350)\n"
       "      --preset large 30 days at the default scale, the benchmarks' store\n"
       "  -q, --quiet        print nothing but errors\n",
       out);
