@@ -1,226 +1,244 @@
-// The one-line texts of the twelve classes that have one.
+// What records show of their fields: the dictionary form (exact keys; the
+// value kinds are pinned by the schema cross-check), the one-line texts of the
+// twelve classes that have one, wall and absolute times, the UUIDs of a
+// process and of a boot, and the assertions that stop a write without a
+// required string.
 #include <gtest/gtest.h>
 
-#include <functional>
+#include <map>
 #include <set>
 
 #include "RecordTestSupport.h"
-#include "Records/BatteryChargeLevel.h"
-#include "Records/Cstates.h"
-#include "Records/DeviceChange.h"
-#include "Records/DisplayBrightness.h"
-#include "Records/FanState.h"
-#include "Records/Interrupts.h"
+#include "Records/LogStartsV0.h"
 #include "Records/LogStartsV1.h"
-#include "Records/PackageEnergyStatistics.h"
-#include "Records/PowerStateChange.h"
 #include "Records/ProcessUsage.h"
-#include "Records/SleepWake.h"
-#include "Records/UserIdle.h"
+#include "Records/SmcKeys.h"
 
 namespace bw {
 namespace {
 
-struct TextCase {
-  const char* name;
-  std::function<std::unique_ptr<Record>()> make;
-  std::string expected;
+using C = RecordClass;
+
+// Every dictionary key of every class, in field-number order.
+const std::map<RecordClass, std::string> kKeys = {
+    {C::BatteryChargeLevel,
+     "absoluteTime charge maxCharge cycleCount instantAmperage instantVoltage timeSinceLastCharge "
+     "lastMinuteWattage estimatedTimeRemaining smoothedEstimatedTimeRemaining isFullyCharged"},
+    {C::SleepWake,
+     "absolute_time wall_time reason wake_from_standby wake_type efi_msec booter_msec trampoline_msec "
+     "image_read_msec image_pages image1_pages wake_notification_msec lock_screen_ready_msec "
+     "graphics_ready_msec record_write_absolute_time xcpm_deep_idle_stats"},
+    {C::PanelSelfRefresh, "absolute_time psr_off psr_transit psr_on psr_sleep dpb_off dpb_on"},
+    {C::LogStartsV0, "version absoluteTime wallTime bootUuid systemVersion lastBootUuid"},
+    {C::LogStartsV1,
+     "version absoluteTime wallTime writer bootUuid systemVersion lastBootUuid isFirst lastSystemVersion"},
+    {C::SmcKeys, "absolute_time keys"},
+    {C::SmcKey, "key s64value u64value dvalue bvalue"},
+    {C::PowerStateChange, "absoluteTime change isFullyCharged wallTime"},
+    {C::DateChange, "absoluteTime wallTime reason newYday"},
+    {C::TimeChange, "absoluteTime wallTime reason gmtoff zoneName yday year"},
+    {C::Cstates, "absolute_time is_core core states"},
+    {C::Cstate, "level residency"},
+    {C::PackageEnergyStatistics,
+     "absolute_time energy_model_millijoules pkg_c0_residency pkg_cany_residency pkg_cmax_residency pkg_freq "
+     "pkg_freq_nominal maxbusdelay qos_bg_time qos_idle_time"},
+    {C::DeviceChange, "absoluteTime deviceType deviceName deviceId nowConnected registryEntryId"},
+    {C::FanState, "absolute_time loudness highest_rpm"},
+    {C::SystemIO,
+     "absoluteTime diskReadOps diskWriteOps diskBytesRead diskBytesWritten networkPacketsIn networkPacketsOut "
+     "networkBytesIn networkBytesOut"},
+    {C::DisplayBrightness, "absoluteTime brightness"},
+    {C::SystemMemory,
+     "absoluteTime freeCount wiredCount compressorPageCount purgeableCount purges faults zeroFills reactivations "
+     "pageins pageouts decompressions compressions swapins swapouts compressedPageCount internalPageCount "
+     "externalPageCount ioaccelAllocatedSize ioaccelResidentSize ioaccelWiredSize ioaccelDirtySize "
+     "ioaccelCachedSize ioaccelPurgeableSize memorySize pageSize swapDeviceIsSsd"},
+    {C::UserIdle, "absoluteTime change"},
+    {C::Interrupts, "absoluteTime vectors"},
+    {C::InterruptVector, "cpuNumber interruptCount vectorName"},
+    {C::BluetoothPowerResidency, "absoluteTime timeOff timeOn timeSleep timeIdle"},
+    {C::ProcessUsage,
+     "name pid exitStatus uuid userTime systemTime pkgIdleWkups interruptWkups pageins wiredSize residentSize "
+     "physFootprint procStartAbstime procExitAbstime nowAbstime ppid responsiblePid uid childUserTime "
+     "childSystemTime childPkgIdleWkups childInterruptWkups childPageins childElapsedAbstime "
+     "ioaccelAllocatedSize ioaccelResidentSize ioaccelWiredSize ioaccelDirtySize ioaccelCachedSize "
+     "ioaccelPurgeableSize displayName uniqueid parentUniqueid responsibleUniqueid"},
 };
 
-class OneLineText : public ::testing::TestWithParam<TextCase> {};
-
-TEST_P(OneLineText, MatchesTheExpectedText) {
-  std::optional<std::string> text = GetParam().make()->prettyPrint();
-  ASSERT_TRUE(text.has_value());
-  EXPECT_EQ(*text, GetParam().expected);
+// The dictionary shows each present field under its schema key (the schema
+// cross-check compares whole dictionaries with the library's reading).
+TEST(RecordDictionary, KeysAreExactlyTheseInFieldOrder) {
+  ASSERT_EQ(kKeys.size(), static_cast<std::size_t>(kRecordClassCount));
+  for (const auto& [recordClass, keys] : kKeys) {
+    std::string inOrder;
+    for (const FieldInfo& f : recordSchema(recordClass).fields)
+      inOrder += std::string(inOrder.empty() ? "" : " ") + f.key;
+    EXPECT_EQ(inOrder, keys);
+  }
 }
 
-template <class T, class Setup>
-std::function<std::unique_ptr<Record>()> build(Setup setup) {
-  return [setup]() -> std::unique_ptr<Record> {
-    auto record = std::make_unique<T>();
-    setup(*record);
-    return record;
+TEST(RecordDictionary, DescriptionIsTheDefaultDescriptionThenTheDictionary) {
+  const std::string text = test::build(C::UserIdle, {{"absoluteTime", 42}, {"change", 1}})->description();
+  EXPECT_TRUE(text.starts_with("<UserIdle: 0x")) << text;
+  EXPECT_TRUE(text.ends_with("> {\n    absoluteTime = 42;\n    change = 1;\n}")) << text;
+}
+
+const Uuid kBoot = *Uuid::parse("6A1C1D4E-0B7F-4E3A-9C2D-5F8E7A6B4C3D");
+const std::string kRaw(kBoot.bytes().begin(), kBoot.bytes().end());
+
+Dictionary process(Dictionary status = {}) {
+  status.merge(Dictionary{{"name", "mds"}, {"pid", 321}, {"userTime", 2'500'000'000}, {"systemTime", 600'999'999},
+                          {"interruptWkups", 42}, {"residentSize", 1048576}, {"procStartAbstime", 1000},
+                          {"procExitAbstime", 3'723'000}, {"nowAbstime", 9'000'000}});
+  return status;
+}
+Dictionary vector(unsigned cpu, const char* name, unsigned count) {
+  return {{"cpuNumber", cpu}, {"vectorName", name}, {"interruptCount", count}};
+}
+Dictionary state(unsigned level, unsigned residency) { return {{"level", level}, {"residency", residency}}; }
+
+TEST(OneLineText, MatchesTheExpectedTextForEveryCase) {
+  const std::string usage = "\t 3100 msec\t01:02:02\t    42 intr wkups\tresident  1048576\t321 [mds]";
+  const std::string running = "\t 3100 msec\t02:29:59\t    42 intr wkups\tresident  1048576\t321 [mds]";
+  const std::string sampled = "\t 3100 msec\t00:00:00\t    42 intr wkups\tresident  1048576\t321 [mds]";
+  const std::tuple<RecordClass, Dictionary, std::string> cases[] = {
+      {C::LogStartsV1,
+       {{"systemVersion", "23A344"}, {"bootUuid", kRaw}, {"lastBootUuid", "12345678-9abc-DEF0-0FED-CBA987654321"}},
+       "LogStartsV1\t23A344\t6A1C1D4E-0B7F-4E3A-9C2D-5F8E7A6B4C3D\t12345678-9ABC-DEF0-0FED-CBA987654321"},
+      {C::LogStartsV1, {}, "LogStartsV1\t\t\t"},
+      {C::BatteryChargeLevel, {{"charge", 4321}, {"maxCharge", 5000}, {"cycleCount", 12}},
+       "BatteryChargeLevel\t86.4\t4321\t5000\t12\t"},
+      {C::BatteryChargeLevel, {{"charge", 5000}, {"maxCharge", 5000}}, "BatteryChargeLevel\t100\t5000\t5000\t0\t"},
+      {C::BatteryChargeLevel, {{"charge", -1}, {"maxCharge", 3}, {"cycleCount", -7}},
+       "BatteryChargeLevel\t-33.3\t-1\t3\t-7\t"},
+      {C::BatteryChargeLevel, {{"charge", 10}}, "BatteryChargeLevel\tinf\t10\t0\t0\t"},
+      {C::PowerStateChange, {}, "PowerStateChange\tA/C"},
+      {C::PowerStateChange, {{"change", 2}}, "PowerStateChange\tBattery"},
+      {C::SleepWake, {{"wake_type", "ignored"}}, "Sleep"},
+      {C::SleepWake, {{"reason", 1}, {"wake_type", "EC.LidOpen"}}, "Wake (EC.LidOpen)"},
+      {C::SleepWake, {{"reason", 2}, {"wake_from_standby", true}, {"wake_type", "X"}}, "DarkWake from Standby (X)"},
+      {C::SleepWake, {{"reason", 3}}, "Wake ()"},
+      {C::UserIdle, {}, "UserIdle\tActive"},
+      {C::UserIdle, {{"change", 7}}, "UserIdle\tIdle"},
+      {C::ProcessUsage, process({{"exitStatus", 0}}), "ProcessUsage\t0" + usage},
+      {C::ProcessUsage, process(), "ProcessUsage\t0" + usage},
+      {C::ProcessUsage, process({{"exitStatus", -2}}), "ProcessUsage\t-2" + usage},
+      {C::ProcessUsage, process({{"exitStatus", -1}}), "ProcessUsage\t-" + running},
+      {C::ProcessUsage, process({{"exitStatus", -3}}), "ProcessUsage\tS" + sampled},
+      {C::ProcessUsage, {}, "ProcessUsage\t0\t    0 msec\t00:00:00\t     0 intr wkups\tresident        0\t0 []"},
+      {C::PackageEnergyStatistics, {{"pkg_cany_residency", 987}}, "PackageEnergyStatistics\t987"},
+      {C::DeviceChange, {{"deviceType", 3}, {"deviceName", "Magic Mouse"}, {"deviceId", "0x1234"}, {"nowConnected", 1}},
+       "DeviceChange\t3\t Magic Mouse (@0x1234)\tconnected"},
+      {C::DeviceChange, {{"deviceType", 4}}, "DeviceChange\t4\t  (@)\tdisconnected"},
+      {C::Interrupts,
+       {{"vectors", Array{vector(1, "timer", 50), vector(0, "hpet", 10), vector(1, "ipi", 7), vector(0, "nvme", 3)}}},
+       "Interrupts\nCPU 0\n\tVector hpet:\t10 interrupts\n\tVector nvme:\t3 interrupts\n"
+       "CPU 1\n\tVector timer:\t50 interrupts\n\tVector ipi:\t7 interrupts\n"},
+      {C::Interrupts, {}, "Interrupts\n"},
+      {C::Cstates, {{"core", -1}, {"states", Array{state(1, 500), state(6, 1234567)}}},
+       "Package C-state detail: C1     500   C6 1234567   "},
+      {C::Cstates, {{"is_core", false}, {"core", 0}}, "Core 0 C-state detail: "},  // core 0 is not the package
+      {C::Cstates, {{"is_core", true}, {"core", 3}, {"states", Array{state(3, 12345678)}}},
+       "Core 3 C-state detail: C3 12345678   "},
+      {C::DisplayBrightness, {{"brightness", 75}}, "DisplayBrightness\t75%"},
+      {C::FanState, {{"loudness", 2}, {"highest_rpm", 3500}}, "FanState\t2 (3500 rpm)"},
+      {C::FanState, {{"loudness", -1}}, "FanState\t4294967295 (0 rpm)"},
   };
+  for (const auto& [c, fields, expected] : cases) EXPECT_EQ(test::build(c, fields)->prettyPrint(), expected);
 }
 
-const Uuid kBoot = *Uuid::parse("0F1E2D3C-4B5A-6978-8796-A5B4C3D2E1F0");
-const Uuid kLastBoot = *Uuid::parse("12345678-9ABC-DEF0-0FED-CBA987654321");
-
-std::string rawBytes(const Uuid& u) { return std::string(u.bytes().begin(), u.bytes().end()); }
-
-ProcessUsage exitedProcess() {
-  ProcessUsage p;
-  p.setName("mds");
-  p.setPid(321);
-  p.setUserTime(2'500'000'000);
-  p.setSystemTime(600'999'999);
-  p.setInterruptWkups(42);
-  p.setResidentSize(1048576);
-  p.setProcStartAbstime(1000);
-  p.setProcExitAbstime(3'723'000);
-  p.setNowAbstime(9'000'000);
-  return p;
+TEST(RecordClasses, OnlyTheTwelveHaveATextAndOnlySixAWallTime) {
+  const std::set<C> withText = {C::BatteryChargeLevel, C::SleepWake, C::LogStartsV1, C::PowerStateChange,
+                                C::Cstates, C::DeviceChange, C::FanState, C::DisplayBrightness, C::UserIdle,
+                                C::ProcessUsage, C::Interrupts, C::PackageEnergyStatistics};
+  const std::set<C> withWallTime = {C::SleepWake, C::LogStartsV0, C::LogStartsV1, C::PowerStateChange,
+                                    C::DateChange, C::TimeChange};
+  for (RecordClass c : test::allRecordClasses()) {
+    Dictionary times;  // the fields named wallTime and absoluteTime, whatever their keys
+    for (const FieldInfo& f : recordSchema(c).fields) {
+      if (f.name == std::string("wallTime")) times[f.key] = 1700000000000u;
+      if (f.name == std::string("absoluteTime")) times[f.key] = 77u;
+    }
+    const std::unique_ptr<Record> r = test::build(c, times);
+    SCOPED_TRACE(recordClassName(c));
+    EXPECT_EQ(r->prettyPrint().has_value(), withText.count(c) == 1);
+    EXPECT_EQ(r->answersWallTime(), withWallTime.count(c) == 1);
+    EXPECT_EQ(r->wallTime(), withWallTime.count(c) ? 1700000000000u : 0u);
+    EXPECT_EQ(r->absoluteTime(), times.empty() ? 0u : 77u);
+  }
 }
 
-InterruptVector vector(std::uint32_t cpu, const char* name, std::uint64_t count) {
-  InterruptVector v;
-  v.setCpuNumber(cpu);
-  v.setVectorName(name);
-  v.setInterruptCount(count);
-  return v;
+TEST(ProcessUsage, TimeIsNowForRunningOrSampledProcessesAndTheExitOtherwise) {
+  const std::pair<std::optional<std::int64_t>, std::uint64_t> cases[] = {
+      {-1, 5000}, {-3, 5000}, {-2, 3000}, {0, 3000}, {1, 3000}, {std::nullopt, 3000}};
+  for (const auto& [status, expected] : cases) {
+    Dictionary fields = {{"nowAbstime", 5000}, {"procExitAbstime", 3000}, {"procStartAbstime", 1000}};
+    if (status) fields["exitStatus"] = *status;
+    EXPECT_EQ(test::build(C::ProcessUsage, fields)->absoluteTime(), expected) << status.value_or(99);
+  }
 }
 
-Cstate state(std::uint64_t level, std::uint64_t residency) {
-  Cstate s;
-  s.setLevel(level);
-  s.setResidency(residency);
-  return s;
+TEST(ProcessUsage, UuidIsTheSixteenRawBytesOrNone) {
+  ProcessUsage usage;
+  EXPECT_EQ(usage.UUID(), std::nullopt);
+  usage.setUuid(kRaw);
+  EXPECT_EQ(usage.UUID(), kBoot);
+  usage.setUuid(kRaw.substr(0, 15));
+  EXPECT_EQ(usage.UUID(), std::nullopt);
+  usage.setUuid(kBoot.string());  // text is not accepted: its first 16 bytes are taken as they are
+  EXPECT_NE(usage.UUID(), kBoot);
 }
 
-INSTANTIATE_TEST_SUITE_P(
-    Records, OneLineText,
-    ::testing::Values(
-        TextCase{"LogStartsV1WithRawAndTextUuids", build<LogStartsV1>([](LogStartsV1& r) {
-                   r.setSystemVersion("23A344");
-                   r.setBootUuid(rawBytes(kBoot));
-                   r.setLastBootUuid(kLastBoot.string());
-                 }),
-                 "LogStartsV1\t23A344\t0F1E2D3C-4B5A-6978-8796-A5B4C3D2E1F0\t12345678-9ABC-DEF0-0FED-"
-                 "CBA987654321"},
-        TextCase{"LogStartsV1WithNothing", build<LogStartsV1>([](LogStartsV1&) {}), "LogStartsV1\t\t\t"},
-        TextCase{"BatteryChargeLevel", build<BatteryChargeLevel>([](BatteryChargeLevel& r) {
-                   r.setCharge(4321);
-                   r.setMaxCharge(5000);
-                   r.setCycleCount(12);
-                 }),
-                 "BatteryChargeLevel\t86.4\t4321\t5000\t12\t"},
-        TextCase{"BatteryChargeLevelFull", build<BatteryChargeLevel>([](BatteryChargeLevel& r) {
-                   r.setCharge(5000);
-                   r.setMaxCharge(5000);
-                 }),
-                 "BatteryChargeLevel\t100\t5000\t5000\t0\t"},
-        TextCase{"BatteryChargeLevelNegative", build<BatteryChargeLevel>([](BatteryChargeLevel& r) {
-                   r.setCharge(-1);
-                   r.setMaxCharge(3);
-                   r.setCycleCount(-7);
-                 }),
-                 "BatteryChargeLevel\t-33.3\t-1\t3\t-7\t"},
-        TextCase{"BatteryChargeLevelWithoutMaxCharge",
-                 build<BatteryChargeLevel>([](BatteryChargeLevel& r) { r.setCharge(10); }),
-                 "BatteryChargeLevel\tinf\t10\t0\t0\t"},
-        TextCase{"PowerStateChangeAC", build<PowerStateChange>([](PowerStateChange&) {}),
-                 "PowerStateChange\tA/C"},
-        TextCase{"PowerStateChangeBattery",
-                 build<PowerStateChange>([](PowerStateChange& r) { r.setChange(2); }),
-                 "PowerStateChange\tBattery"},
-        TextCase{"SleepWakeSleep", build<SleepWake>([](SleepWake& r) { r.setWakeType("ignored"); }), "Sleep"},
-        TextCase{"SleepWakeWake", build<SleepWake>([](SleepWake& r) {
-                   r.setReason(1);
-                   r.setWakeType("EC.LidOpen");
-                 }),
-                 "Wake (EC.LidOpen)"},
-        TextCase{"SleepWakeDarkWakeFromStandby", build<SleepWake>([](SleepWake& r) {
-                   r.setReason(2);
-                   r.setWakeFromStandby(true);
-                   r.setWakeType("X");
-                 }),
-                 "DarkWake from Standby (X)"},
-        TextCase{"SleepWakeOtherReasonWithoutType", build<SleepWake>([](SleepWake& r) { r.setReason(3); }),
-                 "Wake ()"},
-        TextCase{"UserIdleActive", build<UserIdle>([](UserIdle&) {}), "UserIdle\tActive"},
-        TextCase{"UserIdleIdle", build<UserIdle>([](UserIdle& r) { r.setChange(7); }), "UserIdle\tIdle"},
-        TextCase{"ProcessUsageExited", build<ProcessUsage>([](ProcessUsage& r) {
-                   r = exitedProcess();
-                   r.setExitStatus(0);
-                 }),
-                 "ProcessUsage\t0\t 3100 msec\t01:02:02\t    42 intr wkups\tresident  1048576\t321 [mds]"},
-        TextCase{"ProcessUsageWithoutExitStatus",
-                 build<ProcessUsage>([](ProcessUsage& r) { r = exitedProcess(); }),
-                 "ProcessUsage\t0\t 3100 msec\t01:02:02\t    42 intr wkups\tresident  1048576\t321 [mds]"},
-        TextCase{"ProcessUsageFailed", build<ProcessUsage>([](ProcessUsage& r) {
-                   r = exitedProcess();
-                   r.setExitStatus(-2);
-                 }),
-                 "ProcessUsage\t-2\t 3100 msec\t01:02:02\t    42 intr wkups\tresident  1048576\t321 [mds]"},
-        TextCase{"ProcessUsageRunning", build<ProcessUsage>([](ProcessUsage& r) {
-                   r = exitedProcess();
-                   r.setExitStatus(-1);
-                 }),
-                 "ProcessUsage\t-\t 3100 msec\t02:29:59\t    42 intr wkups\tresident  1048576\t321 [mds]"},
-        TextCase{"ProcessUsageSampled", build<ProcessUsage>([](ProcessUsage& r) {
-                   r = exitedProcess();
-                   r.setExitStatus(-3);
-                 }),
-                 "ProcessUsage\tS\t 3100 msec\t00:00:00\t    42 intr wkups\tresident  1048576\t321 [mds]"},
-        TextCase{"ProcessUsageEmpty", build<ProcessUsage>([](ProcessUsage&) {}),
-                 "ProcessUsage\t0\t    0 msec\t00:00:00\t     0 intr wkups\tresident        0\t0 []"},
-        TextCase{"PackageEnergyStatistics", build<PackageEnergyStatistics>([](PackageEnergyStatistics& r) {
-                   r.setPkgCanyResidency(987);
-                 }),
-                 "PackageEnergyStatistics\t987"},
-        TextCase{"PackageEnergyStatisticsAbsent",
-                 build<PackageEnergyStatistics>([](PackageEnergyStatistics& r) {
-                   r.setPkgCanyResidency(987);
-                   r.setHasPkgCanyResidency(false);
-                 }),
-                 "PackageEnergyStatistics\t0"},
-        TextCase{"DeviceChangeConnected", build<DeviceChange>([](DeviceChange& r) {
-                   r.setDeviceType(3);
-                   r.setDeviceName("Magic Mouse");
-                   r.setDeviceId("0x1234");
-                   r.setNowConnected(1);
-                 }),
-                 "DeviceChange\t3\t Magic Mouse (@0x1234)\tconnected"},
-        TextCase{"DeviceChangeDisconnected", build<DeviceChange>([](DeviceChange& r) { r.setDeviceType(4); }),
-                 "DeviceChange\t4\t  (@)\tdisconnected"},
-        TextCase{"InterruptsGroupedByCpu", build<Interrupts>([](Interrupts& r) {
-                   r.addVectors(vector(1, "timer", 50));
-                   r.addVectors(vector(0, "hpet", 10));
-                   r.addVectors(vector(1, "ipi", 7));
-                   r.addVectors(vector(0, "nvme", 3));
-                 }),
-                 "Interrupts\nCPU 0\n\tVector hpet:\t10 interrupts\n\tVector nvme:\t3 interrupts\n"
-                 "CPU 1\n\tVector timer:\t50 interrupts\n\tVector ipi:\t7 interrupts\n"},
-        TextCase{"InterruptsEmpty", build<Interrupts>([](Interrupts&) {}), "Interrupts\n"},
-        TextCase{"CstatesPackage", build<Cstates>([](Cstates& r) {
-                   r.setCore(-1);
-                   r.addStates(state(1, 500));
-                   r.addStates(state(6, 1234567));
-                 }),
-                 "Package C-state detail: C1     500   C6 1234567   "},
-        TextCase{"CstatesCoreZeroIsNotThePackage", build<Cstates>([](Cstates& r) {
-                   r.setIsCore(false);
-                   r.setCore(0);
-                 }),
-                 "Core 0 C-state detail: "},
-        TextCase{"CstatesCore", build<Cstates>([](Cstates& r) {
-                   r.setIsCore(true);
-                   r.setCore(3);
-                   r.addStates(state(3, 12345678));
-                 }),
-                 "Core 3 C-state detail: C3 12345678   "},
-        TextCase{"DisplayBrightness",
-                 build<DisplayBrightness>([](DisplayBrightness& r) { r.setBrightness(75); }),
-                 "DisplayBrightness\t75%"},
-        TextCase{"FanState", build<FanState>([](FanState& r) {
-                   r.setLoudness(2);
-                   r.setHighestRpm(3500);
-                 }),
-                 "FanState\t2 (3500 rpm)"},
-        TextCase{"FanStateNegativeLoudness", build<FanState>([](FanState& r) { r.setLoudness(-1); }),
-                 "FanState\t4294967295 (0 rpm)"}),
-    [](const auto& info) { return std::string(info.param.name); });
-
-TEST(OneLineText, OnlyTheTwelveClassesHaveOne) {
-  const std::set<RecordClass> withText = {
-      RecordClass::BatteryChargeLevel, RecordClass::SleepWake,    RecordClass::LogStartsV1,
-      RecordClass::PowerStateChange,   RecordClass::Cstates,      RecordClass::PackageEnergyStatistics,
-      RecordClass::DeviceChange,       RecordClass::FanState,     RecordClass::DisplayBrightness,
-      RecordClass::UserIdle,           RecordClass::ProcessUsage, RecordClass::Interrupts,
+TEST(LogStarts, BootUuidsAreRawBytesOrTextInBothHeaderForms) {
+  const std::tuple<const char*, std::optional<std::string>, std::optional<Uuid>> cases[] = {
+      {"absent", std::nullopt, std::nullopt},
+      {"empty", std::string(), std::nullopt},
+      {"raw sixteen bytes", kRaw, kBoot},
+      {"upper-case text", kBoot.string(), kBoot},
+      {"lower-case text", "6a1c1d4e-0b7f-4e3a-9c2d-5f8e7a6b4c3d", kBoot},
+      {"text with a trailing NUL", kBoot.string() + std::string(1, '\0'), kBoot},
+      {"seventeen bytes are taken as text", kRaw + "x", std::nullopt},
+      {"malformed text", "6A1C1D4E+0B7F-4E3A-9C2D-5F8E7A6B4C3D", std::nullopt},
+      {"raw cut short", kRaw.substr(0, 15), std::nullopt},
+      {"one byte", std::string(1, '\x7f'), std::nullopt},
   };
-  for (RecordClass c : test::allRecordClasses())
-    EXPECT_EQ(makeRecord(c)->prettyPrint().has_value(), withText.count(c) == 1) << recordClassName(c);
+  for (const auto& [what, bytes, expected] : cases) {
+    const Dictionary fields = bytes ? Dictionary{{"bootUuid", *bytes}, {"lastBootUuid", *bytes}} : Dictionary{};
+    auto v1 = test::build(C::LogStartsV1, fields), v0 = test::build(C::LogStartsV0, fields);
+    EXPECT_EQ(static_cast<LogStartsV1&>(*v1).bootUUID(), expected) << what;
+    EXPECT_EQ(static_cast<LogStartsV1&>(*v1).lastBootUUID(), expected) << what;
+    EXPECT_EQ(static_cast<LogStartsV0&>(*v0).bootUUID(), expected) << what;
+    EXPECT_EQ(static_cast<LogStartsV0&>(*v0).lastBootUUID(), expected) << what;
+  }
+}
+
+TEST(LogStarts, AGivenUuidWinsUntilItIsClearedAndOnlyCopyKeepsIt) {
+  LogStartsV1 header, target;
+  header.setBootUuid(kRaw);
+  const Uuid other = *Uuid::parse("00000000-0000-0000-0000-0000000000AA");
+  header.setBootUUID(other);
+  header.setLastBootUUID(other);
+  EXPECT_EQ(header.bootUUID(), other);
+  EXPECT_EQ(header.lastBootUUID(), other);
+  EXPECT_EQ(recordCast<LogStartsV1>(header.copy().get())->bootUUID(), other);
+  header.copyTo(target);  // copies the fields, not the given UUID
+  EXPECT_EQ(target.bootUUID(), kBoot);
+  header.setBootUUID(std::nullopt);
+  EXPECT_EQ(header.bootUUID(), kBoot);
+}
+
+TEST(RequiredStringDeathTest, AnAbsentVersionOrKeyAbortsTheWriteButAnEmptyOneIsWritten) {
+  EXPECT_DEATH(LogStartsV0().serialize(), "nil != self->_version.*Records/LogStartsV0");
+  LogStartsV1 v1;
+  v1.setBootUuid(kRaw);
+  EXPECT_DEATH(v1.serialize(), "nil != self->_version.*Records/LogStartsV1");
+  SmcKeys keys;
+  keys.addKeys(SmcKey());
+  EXPECT_DEATH(keys.serialize(), "nil != self->_key.*Records/SmcKey");
+  v1.setVersion("");
+  auto decoded = test::decode(C::LogStartsV1, v1.serialize());
+  ASSERT_NE(decoded, nullptr);
+  EXPECT_EQ(decoded->dictionaryRepresentation().at("version"), Value(""));
 }
 
 }  // namespace
