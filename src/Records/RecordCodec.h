@@ -72,28 +72,9 @@ inline bool skipField(CodedInputStream& in, std::uint64_t key) {
   return WFL::SkipMessage(&in) && in.LastTagWas(WFL::MakeTag(0, WFL::WIRETYPE_END_GROUP));
 }
 
-// Reads a varint as the library does (at most ten bytes, bits beyond 64
-// dropped), inline while the buffer surely holds all of it: the library's
-// own inline path takes one-byte varints only, and records are mostly wider
-// numbers.
-inline bool readVarint(CodedInputStream& in, std::uint64_t* value) {
-  const void* data;
-  int size;
-  in.GetDirectBufferPointerInline(&data, &size);
-  const auto* p = static_cast<const std::uint8_t*>(data);
-  if (size >= 10 || (size > 0 && p[size - 1] < 0x80)) {
-    std::uint64_t result = 0;
-    for (int i = 0; i < 10; ++i) {
-      result |= static_cast<std::uint64_t>(p[i] & 0x7F) << (7 * i);
-      if (p[i] < 0x80) {
-        *value = result;
-        return in.Skip(i + 1);
-      }
-    }
-    return false;
-  }
-  return in.ReadVarint64(value);
-}
+// Reads a varint with the library's reader (at most ten bytes, bits beyond
+// 64 dropped).
+inline bool readVarint(CodedInputStream& in, std::uint64_t* value) { return in.ReadVarint64(value); }
 
 // Reads a length-delimited string or bytes value, copied straight from the
 // buffer when all of it is there. As in the library, the length is the low
