@@ -3,11 +3,10 @@
 // references below are simple loops over every sample or event.
 #include <gtest/gtest.h>
 
-#include <cmath>
-#include <limits>
+#include <algorithm>
 #include <random>
 
-#include "accum/DataSet.h"
+#include "Support.h"
 #include "accum/Interpolator.h"
 #include "accum/Ledger.h"
 #include "accum/SawtoothInterpolator.h"
@@ -16,37 +15,29 @@ namespace bw {
 namespace {
 
 using Points = std::vector<std::pair<std::uint64_t, double>>;
-
-// --- references -----------------------------------------------------------
+using test::expectSame;
 
 std::uint64_t referenceTime(const std::vector<std::uint64_t>& credits, const std::vector<std::uint64_t>& debits,
                             Range range) {
-  const std::uint64_t kInf = std::numeric_limits<std::uint64_t>::max();
-  const std::uint64_t L = range.location, e = range.location + range.length;
-  if (!credits.empty() && credits[0] > e) return 0;
-  if (credits.empty() && debits.empty()) return 0;
+  const std::uint64_t kInf = UINT64_MAX, L = range.location, e = range.location + range.length;
+  if ((!credits.empty() && credits[0] > e) || (credits.empty() && debits.empty())) return 0;
   std::int64_t level = 0;
   std::uint64_t open = L, total = 0;
-  std::size_t ci = 0, di = 0;
-  for (;;) {
-    std::uint64_t c = ci < credits.size() ? credits[ci] : kInf;
-    std::uint64_t d = di < debits.size() ? debits[di] : kInf;
+  for (std::size_t ci = 0, di = 0; ci < credits.size() || di < debits.size();) {
+    const std::uint64_t c = ci < credits.size() ? credits[ci] : kInf, d = di < debits.size() ? debits[di] : kInf;
     if (c < d) {
-      if (level == 0) open = std::max(c, L);
-      ++level;
+      if (level++ == 0) open = std::max(c, L);
       ++ci;
-    } else {
-      if (level == 1 || d > e) {
-        if (d > L) total += std::min(d, e) - open;
-        if (c > e) return total;
-      }
-      --level;
-      ++di;
+      continue;
     }
-    if (ci == credits.size() && di == debits.size()) break;
+    if (level == 1 || d > e) {
+      if (d > L) total += std::min(d, e) - open;
+      if (c > e) return total;
+    }
+    --level;
+    ++di;
   }
-  if (level >= 1 && open < e) total += e - open;
-  return total;
+  return level >= 1 && open < e ? total + (e - open) : total;
 }
 
 // Chosen samples for (p, approach, hold), by counting instead of searching.
@@ -58,19 +49,16 @@ Points referencePoints(const Points& s, std::uint64_t p, int approach, bool hold
   if (approach < 0 && i >= 2) return {s[i - 2], s[i - 1]};
   if (approach == 0 && i > 0 && i < n) return {s[i - 1], s[i]};
   if (approach > 0 && i + 1 < n) return {s[i], s[i + 1]};
-  if (!hold) return {};
-  if (approach <= 0 && i == n) return {s[n - 1]};
-  if (approach >= 0 && i == 0) return {s[0]};
+  if (hold && approach <= 0 && i == n) return {s[n - 1]};
+  if (hold && approach >= 0 && i == 0) return {s[0]};
   return {};
 }
 
 double referenceValue(const Points& s, std::uint64_t p, int approach = 0, bool hold = true) {
   Points pts = referencePoints(s, p, approach, hold);
-  if (pts.empty()) return NAN;
-  if (pts.size() == 1) return pts[0].second;
-  auto [x0, y0] = pts[0];
-  auto [x1, y1] = pts[1];
-  double slope = (y1 - y0) / static_cast<double>(x1 - x0);
+  if (pts.size() < 2) return pts.empty() ? NAN : pts[0].second;
+  const auto [x0, y0] = pts[0];
+  const double slope = (pts[1].second - y0) / static_cast<double>(pts[1].first - x0);
   return x0 <= p ? y0 + slope * static_cast<double>(p - x0) : y0 - slope * static_cast<double>(x0 - p);
 }
 
@@ -80,141 +68,94 @@ double referenceSlope(const std::vector<Points>& segments, std::uint64_t a, std:
   std::uint64_t time = 0;
   for (std::size_t j = 0; j < segments.size(); ++j) {
     const Points& s = segments[j];
-    std::uint64_t lo = s.front().first, hi = s.back().first;
+    const std::uint64_t lo = s.front().first, hi = s.back().first;
     if (a > hi) continue;
     if (b < lo) break;
-    double va = referenceValue(s, a), vb = referenceValue(s, b);
-    std::uint64_t x = std::max(a, lo), y = b;
-    if (b > hi) {
-      if (j + 1 != segments.size()) {
-        y = hi;
-        vb = referenceValue(s, y);
-      } else {
-        vb = referenceValue(s, b, -1, false);
-      }
-    }
-    delta += vb - va;
-    time += y - x;
+    const bool last = j + 1 == segments.size();
+    const std::uint64_t y = b > hi && !last ? hi : b;  // only the last segment's line runs on past its end
+    delta += (b > hi && last ? referenceValue(s, b, -1, false) : referenceValue(s, y)) - referenceValue(s, a);
+    time += y - std::max(a, lo);
   }
   return delta / static_cast<double>(time);
 }
 
-void expectClose(double actual, double expected, const std::string& where) {
-  if (std::isnan(expected) || std::isnan(actual)) {
-    EXPECT_EQ(std::isnan(actual), std::isnan(expected)) << where << ": " << actual << " vs " << expected;
-  } else if (std::isinf(expected)) {
-    EXPECT_EQ(actual, expected) << where;
-  } else {
-    EXPECT_NEAR(actual, expected, 1e-9 * std::max(1.0, std::fabs(expected))) << where;
-  }
+// Whole numbers from 0 to n, both included.
+auto randomBelow(unsigned seed) {
+  return [engine = std::mt19937_64(seed)](std::uint64_t n) mutable {
+    return std::uniform_int_distribution<std::uint64_t>(0, n)(engine);
+  };
 }
 
-// --- comparisons ----------------------------------------------------------
-
-TEST(ReferenceComparison, LedgerTimeMatchesTheEventWalk) {
-  std::mt19937_64 rng(7);
-  auto below = [&](std::uint64_t n) { return std::uniform_int_distribution<std::uint64_t>(0, n)(rng); };
+// Random events, mostly ascending, sometimes back in time; queries while
+// they arrive, after them, and after merging another ledger in.
+TEST(ReferenceComparison, LedgerTimeAndValueMatchTheEventWalk) {
+  auto below = randomBelow(7);
+  auto check = [&](const Ledger& ledger, Range r, std::uint64_t p) {
+    ASSERT_EQ(ledger.timeValueWasGreaterThanZeroOverRange(r), referenceTime(ledger.credits(), ledger.debits(), r))
+        << "range " << r.location << "+" << r.length;
+    const auto credits = std::ranges::count_if(ledger.credits(), [p](auto c) { return c <= p; });
+    const auto debits = std::ranges::count_if(ledger.debits(), [p](auto d) { return d <= p; });
+    ASSERT_EQ(ledger.valueAtPosition(p), static_cast<std::uint64_t>(std::max<std::ptrdiff_t>(credits - debits, 0)));
+  };
+  auto list = [&] { return below(1) ? Ledger::List::Credits : Ledger::List::Debits; };
   for (int round = 0; round < 3000; ++round) {
-    Ledger ledger;
-    const int events = static_cast<int>(below(16));
+    SCOPED_TRACE(round);
+    Ledger ledger, other;
     std::uint64_t position = 0;
-    for (int k = 0; k < events; ++k) {
-      // Mostly ascending, sometimes back in time; credits and debits mixed.
+    for (int k = 0, events = static_cast<int>(below(16)); k < events; ++k) {
       position = below(5) == 0 ? below(position) : position + below(6);
-      if (below(1)) {
-        ledger.addCreditAtPosition(position);
-      } else {
-        ledger.addDebitAtPosition(position);
-      }
-      if (below(3) == 0) {
-        Range r{below(60), below(60)};
-        ASSERT_EQ(ledger.timeValueWasGreaterThanZeroOverRange(r), referenceTime(ledger.credits(), ledger.debits(), r))
-            << "round " << round << " after " << k << " events, range " << r.location << "+" << r.length;
-      }
+      ledger.addTo(list(), position);
+      if (below(3) == 0) check(ledger, Range{below(60), below(60)}, below(60));
     }
-    for (int q = 0; q < 20; ++q) {
-      Range r{below(80), below(80)};
-      if (q == 0) r = Range{below(80), std::numeric_limits<std::uint64_t>::max() - below(3)};  // end wraps
-      ASSERT_EQ(ledger.timeValueWasGreaterThanZeroOverRange(r), referenceTime(ledger.credits(), ledger.debits(), r))
-          << "round " << round << " range " << r.location << "+" << r.length;
-      std::uint64_t p = below(80);
-      std::uint64_t credits = 0, debits = 0;
-      for (auto c : ledger.credits()) credits += c <= p;
-      for (auto d : ledger.debits()) debits += d <= p;
-      ASSERT_EQ(ledger.valueAtPosition(p), credits > debits ? credits - debits : 0);
-    }
+    check(ledger, Range{below(80), UINT64_MAX - below(3)}, 0);  // the end wraps
+    for (int q = 0; q < 20; ++q) check(ledger, Range{below(80), below(80)}, below(80));
+    for (int k = 0; k < 4; ++k) other.addTo(list(), below(40));
+    ledger.merge(other);
+    ledger.finalizeMerges();
+    for (int q = 0; q < 5; ++q) check(ledger, Range{below(50), below(50)}, below(50));
   }
 }
 
-TEST(ReferenceComparison, MergedLedgerMatchesTheEventWalkOnceFinalized) {
-  std::mt19937_64 rng(11);
-  auto below = [&](std::uint64_t n) { return std::uniform_int_distribution<std::uint64_t>(0, n)(rng); };
-  for (int round = 0; round < 500; ++round) {
-    Ledger a, b;
-    for (int k = 0; k < 8; ++k) {
-      (below(1) ? a : b).addTo(below(1) ? Ledger::List::Credits : Ledger::List::Debits, below(40));
-    }
-    a.timeValueWasGreaterThanZeroOverRange({0, 10});  // tables built before the merge
-    a.merge(b);
-    a.finalizeMerges();
-    for (int q = 0; q < 10; ++q) {
-      Range r{below(50), below(50)};
-      ASSERT_EQ(a.timeValueWasGreaterThanZeroOverRange(r), referenceTime(a.credits(), a.debits(), r));
-    }
-  }
-}
-
-TEST(ReferenceComparison, DataSetQueriesMatchPlainScans) {
-  std::mt19937_64 rng(3);
-  auto below = [&](std::uint64_t n) { return std::uniform_int_distribution<std::uint64_t>(0, n)(rng); };
+TEST(ReferenceComparison, DataSetIndexesAndInterpolatedValuesMatchPlainScans) {
+  auto below = randomBelow(3);
   for (int round = 0; round < 2000; ++round) {
+    SCOPED_TRACE(round);
     Interpolator interpolator;
     Points stored;
-    const int n = static_cast<int>(below(10));
-    for (int k = 0; k < n; ++k) {
-      std::uint64_t p = below(40);
-      double v = static_cast<double>(below(1000)) / 4;
+    for (int k = 0, n = static_cast<int>(below(10)); k < n; ++k) {
+      const std::uint64_t p = below(40);
+      const double v = static_cast<double>(below(1000)) / 4;  // stored truncated
       interpolator.addValue(v, p);
-      // The reference keeps the truncated value, inserted before equal positions
-      // unless appended at or past the largest position.
+      // Inserted before equal positions unless at or past the largest.
       auto at = std::lower_bound(stored.begin(), stored.end(), std::make_pair(p, -1.0));
-      if (stored.empty() || p >= stored.back().first) at = stored.end();
-      stored.insert(at, {p, std::trunc(v)});
+      stored.insert(stored.empty() || p >= stored.back().first ? stored.end() : at, {p, std::trunc(v)});
     }
-    const DataSet& set = interpolator.dataSet();
     for (int q = 0; q < 20; ++q) {
-      Range r{below(45), below(20)};
+      const Range r{below(45), below(20)}, indexes = interpolator.dataSet().indexRangeForRange(r);
       std::vector<std::size_t> inside;
-      for (std::size_t i = 0; i < stored.size(); ++i) {
+      for (std::size_t i = 0; i < stored.size(); ++i)
         if (stored[i].first >= r.location && stored[i].first < r.end()) inside.push_back(i);
-      }
-      Range indexes = set.indexRangeForRange(r);
       ASSERT_EQ(indexes.length, inside.size());
-      if (!inside.empty()) {
-        ASSERT_EQ(indexes.location, inside.front());
-      }
-      std::uint64_t p = below(45);
-      int approach = static_cast<int>(below(2)) - 1;
-      bool hold = below(1);
-      std::string where = "round " + std::to_string(round) + " p " + std::to_string(p) + " approach " +
-                          std::to_string(approach) + (hold ? " hold" : "");
-      expectClose(interpolator.interpolateValueAtPosition(p, approach, hold),
-                  referenceValue(stored, p, approach, hold), where);
-      expectClose(interpolator.valueAtPosition(p), referenceValue(stored, p), where);
+      ASSERT_TRUE(inside.empty() || indexes.location == inside.front());
+      const std::uint64_t p = below(45);
+      const int approach = static_cast<int>(below(2)) - 1;
+      const bool hold = below(1);
+      expectSame({interpolator.interpolateValueAtPosition(p, approach, hold), interpolator.valueAtPosition(p)},
+                 {referenceValue(stored, p, approach, hold), referenceValue(stored, p)},
+                 "at " + std::to_string(p) + " approach " + std::to_string(approach) + (hold ? " hold" : ""));
     }
   }
 }
 
 TEST(ReferenceComparison, SawtoothSlopeMatchesTheSegmentWalk) {
-  std::mt19937_64 rng(5);
-  auto below = [&](std::uint64_t n) { return std::uniform_int_distribution<std::uint64_t>(0, n)(rng); };
+  auto below = randomBelow(5);
   for (int round = 0; round < 1500; ++round) {
+    SCOPED_TRACE(round);
     SawtoothInterpolator saw;
     std::vector<Points> segments{{{0, 0}}};
     double last = 0;
     std::uint64_t position = 0;
-    const int n = static_cast<int>(below(30));
-    for (int k = 0; k < n; ++k) {
+    for (int k = 0, n = static_cast<int>(below(30)); k < n; ++k) {
       position += below(4);
       // Whole numbers mostly; a fraction now and then (stored truncated).
       double value = below(5) == 0 ? static_cast<double>(below(20)) : last + static_cast<double>(below(6));
@@ -224,16 +165,15 @@ TEST(ReferenceComparison, SawtoothSlopeMatchesTheSegmentWalk) {
       segments.back().push_back({position, std::trunc(value)});
       last = value;
       if (below(4) == 0) {
-        std::uint64_t a = below(position + 5), b = a + below(20);
-        expectClose(saw.averageSlopeFrom(a, b), referenceSlope(segments, a, b),
-                    "round " + std::to_string(round) + " while filling");
+        const std::uint64_t a = below(position + 5), b = a + below(20);
+        expectSame({saw.averageSlopeFrom(a, b)}, {referenceSlope(segments, a, b)}, "while filling");
       }
     }
     ASSERT_EQ(saw.segments().size(), segments.size());
     for (int q = 0; q < 30; ++q) {
-      std::uint64_t a = below(position + 10), b = below(position + 10);  // b < a included
-      expectClose(saw.averageSlopeFrom(a, b), referenceSlope(segments, a, b),
-                  "round " + std::to_string(round) + " from " + std::to_string(a) + " to " + std::to_string(b));
+      const std::uint64_t a = below(position + 10), b = below(position + 10);  // b < a included
+      expectSame({saw.averageSlopeFrom(a, b)}, {referenceSlope(segments, a, b)},
+                 "from " + std::to_string(a) + " to " + std::to_string(b));
     }
   }
 }
