@@ -1,0 +1,539 @@
+// The time module: segments and the timelines made of them (hand-computed cases, and a
+// literal walk over all children on random timelines), boots cut into segments and
+// chained into runs, ranges of absolute time, and the local calendar across DST changes.
+#include <gtest/gtest.h>
+
+#include <any>
+#include <cstdlib>
+#include <ctime>
+#include <deque>
+#include <map>
+#include <random>
+#include <set>
+#include <sstream>
+
+#include "Records/LogStartsV0.h"
+#include "Records/LogStartsV1.h"
+#include "Records/SleepWake.h"
+#include "Records/TimeChange.h"
+#include "Records/UserIdle.h"
+#include "base/Console.h"
+#include "base/Exception.h"
+#include "time/AbsRange.h"
+#include "time/AbsoluteTimeline.h"
+#include "time/BootSequencer.h"
+#include "time/BootTimeline.h"
+#include "time/Calendar.h"
+
+namespace bw {
+namespace {
+
+// 2023-11-14 22:13:20 UTC, a wall time well after the clock-set cut-off.
+inline constexpr std::uint64_t kWall = 1700000000000ULL;
+
+// The exception `call` throws, if any.
+template <class F>
+std::optional<Exception> thrown(F&& call) {
+  try {
+    call();
+  } catch (const Exception& e) {
+    return e;
+  }
+  return std::nullopt;
+}
+
+// "NAME: REASON" of the exception `call` throws; "nothing" when none.
+template <class F>
+std::string thrownText(F&& call) {
+  const std::optional<Exception> e = thrown(call);
+  return e ? e->name() + ": " + e->reason() : "nothing";
+}
+
+using Lookup = std::pair<std::uint64_t, std::optional<std::uint64_t>>;  // wall time, absolute time
+using Calls = std::vector<std::array<std::uint64_t, 3>>;                 // position, wall time, absolute time
+
+Lookup lookup(const Timeline& t, std::uint64_t position, std::uint64_t offset) {
+  auto abs = t.absoluteTimeForRelative(position, offset);
+  return {t.wallTimeForRelative(position, offset), abs ? std::optional(abs->time) : std::nullopt};
+}
+
+std::vector<Range> spans(const std::vector<AbsRange>& ranges) {
+  std::vector<Range> result;
+  for (const AbsRange& r : ranges) result.push_back(r.range());
+  return result;
+}
+
+using List = std::vector<std::uint64_t>;
+using Records = std::vector<Record*>;
+
+Uuid uuid(int n) { return *Uuid::parse("00000000-0000-0000-0000-0000000000" + format("%02d", n)); }
+const Uuid kA = uuid(1), kB = uuid(2), kC = uuid(3), kD = uuid(4);
+
+std::pair<Uuid, std::uint64_t> pairOf(const AbsTime& t) { return {t.boot, t.time}; }
+
+List positions(const Timeline& t) {
+  List result;
+  t.enumerateEventsUsingBlock([&](auto&, std::uint64_t p, auto, auto&, bool&) { result.push_back(p); });
+  return result;
+}
+
+std::string warning(std::initializer_list<Uuid> left) {
+  std::string text = "Warning: could not sequence some boots:\n";
+  for (const Uuid& u : left) text += "\t" + u.string() + "\n";
+  return text;
+}
+
+// Real records, owned by the fixture, for the timelines and boots built in tests.
+class TimeTest : public testing::Test {
+ protected:
+  void SetUp() override { setConsole(&out_, nullptr); }
+  void TearDown() override { setConsole(nullptr, nullptr); }
+
+  template <class T>
+  T& make(std::uint64_t abs, std::uint64_t wall = 0) {
+    auto& r = static_cast<T&>(*records_.emplace_back(std::make_unique<T>()));
+    r.setAbsoluteTime(abs);
+    if constexpr (requires { r.setWallTime(wall); }) r.setWallTime(wall);
+    return r;
+  }
+  // A boot's header; a null `version` leaves the system version absent.
+  Record* header(std::uint64_t abs, std::uint64_t wall, const char* version = "23A344", std::optional<Uuid> last = {}) {
+    auto& r = make<LogStartsV1>(abs, wall);
+    r.setVersion("1");
+    if (version != nullptr) r.setSystemVersion(version);
+    r.setLastBootUUID(last);
+    return &r;
+  }
+  Record* idle(std::uint64_t abs) { return &make<UserIdle>(abs); }
+  Record* wake(std::uint64_t abs, std::uint64_t wall) {
+    auto& r = make<SleepWake>(abs, wall);
+    r.setReason(1);
+    return &r;
+  }
+  Record* clockSet(std::uint64_t abs, std::uint64_t wall) { return &make<TimeChange>(abs, wall); }
+  // A record at `abs` with wall time `wall` (a wake), or without one (0).
+  Record* at(std::uint64_t abs, std::uint64_t wall = 0) { return wall != 0 ? wake(abs, wall) : idle(abs); }
+
+
+  // A segment of (absolute time, wall time) records; wall time 0 is none.
+  std::unique_ptr<AbsoluteTimeline> segment(std::initializer_list<std::pair<std::uint64_t, std::uint64_t>> spec) {
+    auto s = std::make_unique<AbsoluteTimeline>(nullptr);
+    for (auto [abs, wall] : spec) s->addObject(at(abs, wall));
+    return s;
+  }
+  // A: ticks 0..100 at wall 10000..10100. B: ticks 200..300 from wall
+  // `bStartWall`; at 10700, 600 ms of wall clock after A, B sits at offset 700.
+  std::unique_ptr<Timeline> twoSegments(std::uint64_t bStartWall = 10700) {
+    std::vector<std::unique_ptr<Timeline>> children;
+    children.push_back(segment({{0, 10000}, {50, 0}, {100, 0}}));
+    children.push_back(segment({{200, bStartWall}, {250, 0}, {300, 0}}));
+    return Timeline::timelineWithTimelines(std::move(children));
+  }
+  // A walk's calls, its block asking to stop at call `stopAt`; with `ranges` null, a plain walk from 1000.
+  static Calls calls(const Timeline& t, const std::vector<Range>* ranges, std::size_t stopAt = 1) {
+    Calls result;
+    EventBlock block = [&](const Record&, std::uint64_t p, std::uint64_t w, const AbsTime& a, bool& stop) {
+      result.push_back({p, w, a.time});
+      stop = result.size() == stopAt;
+    };
+    ranges ? t.enumerateEventsInRelativeRanges(*ranges, block) : (void)t.enumerateEventsWithOffset(1000, block);
+    return result;
+  }
+  // Each kept chain as "VERSION: NN NN\n" (the last two digits of its boots), then what was printed.
+  std::string sequenced() {
+    std::string text;
+    for (const auto& [version, timeline] : sequenceBoots(boots_)) {
+      text += version + ":";
+      for (const auto& boot : timeline->objects())
+        text += " " + static_cast<const BootTimeline&>(*boot).uuid().string().substr(34);
+      text += "\n";
+    }
+    return text + std::exchange(out_, std::ostringstream()).str();
+  }
+  std::deque<std::unique_ptr<Record>> records_;
+  BootRecords boots_;
+  std::ostringstream out_;
+};
+
+TEST_F(TimeTest, ASegmentTakesItsSkewFromItsStartAndAnswersOnlyWithAnOffset) {
+  AbsoluteTimeline empty(nullptr);
+  EXPECT_EQ(std::pair(empty.startAbsoluteTime(), empty.endAbsoluteTime()), std::pair(UINT64_MAX, std::uint64_t{0}));
+  auto s = segment({{100, 0}, {150, 5150}});
+  EXPECT_EQ(s->skew(), 5050);
+  EXPECT_EQ(std::pair(s->startWallTime(), s->endWallTime()), std::pair(std::uint64_t{5150}, std::uint64_t{5200}));
+  s->addObject(at(200, 5250));
+  EXPECT_EQ(thrownText([&] { s->addObject(at(300, 5300)); }),
+            "NSInternalInconsistencyException: event skew mismatch");
+  // At offset 1000 (skew 5000, duration 200): a wall time at the first instant but no absolute time.
+  s = segment({{100, 5100}, {300, 0}});
+  const std::pair<std::uint64_t, Lookup> cases[] = {
+      {999, {0, {}}}, {1000, {5100, {}}}, {1001, {5101, 101}}, {1200, {5300, 300}}, {1201, {0, {}}}};
+  for (auto [position, expected] : cases) EXPECT_EQ(lookup(*s, position, 1000), expected) << position;
+  const std::tuple<std::uint64_t, std::uint64_t, std::vector<Range>> ranges[] = {  // clipped to the span
+      {0, 999, {}},           {1201, 2000, {}},           {0, 5000, {{100, 200}}},
+      {0, 1000, {{100, 0}}}, {1050, 1100, {{150, 50}}}, {1200, 1200, {{300, 0}}}};
+  for (auto [from, to, expected] : ranges) EXPECT_EQ(spans(s->absoluteRangesForRelative(from, to, 1000)), expected);
+  EXPECT_THROW(s->absoluteRangesForRelative(1100, 1050, 1000), Exception);
+}
+
+TEST_F(TimeTest, ChildrenApartInWallTimeKeepTheGapAndOverlapsCollapse) {
+  auto t = twoSegments();
+  EXPECT_TRUE(t->enumerateTimelinesWithOffset(5, [&](auto&, std::uint64_t x, bool& stop) { stop = x == 705; }));
+  EXPECT_EQ(std::tuple(t->duration(), t->startWallTime(), t->endWallTime(), t->storedEndWallTime()),
+            std::tuple(800UL, 10000UL, 10800UL, 10700UL));
+  EXPECT_EQ(t->highestAbsTime()->time, 300u);
+  EXPECT_EQ(twoSegments(10050)->duration(), 200u);  // B starts before A ends
+  // A's first instant, the gap (its wall time extrapolated from A's start), B's first instant, past the end.
+  const std::pair<std::uint64_t, Lookup> cases[] = {{0, {10000, {}}},   {1, {10001, 1}},     {699, {10699, {}}},
+                                                    {700, {10700, {}}}, {701, {10701, 201}}, {801, {0, {}}}};
+  for (auto [position, expected] : cases) EXPECT_EQ(lookup(*t, position, 0), expected) << position;
+  EXPECT_EQ(lookup(*t, 5, 10), (Lookup{5, {}}));  // before the offset: no child to extrapolate from
+  EXPECT_EQ(spans(t->absoluteRangesForRelative(50, 750, 0)), (std::vector<Range>{{50, 50}, {200, 50}}));
+  EXPECT_TRUE(t->absoluteRangesForRelative(101, 699, 0).empty());
+  EXPECT_EQ(spans(t->absoluteRangesForRelativeRanges({Range{0, 10}, Range{150, 650}, Range{790, 5}})),
+            (std::vector<Range>{{0, 10}, {200, 100}, {290, 5}}));
+  Timeline empty;
+  EXPECT_EQ(std::tuple(empty.startWallTime(), empty.endWallTime(), empty.duration(), lookup(empty, 0, 0)),
+            std::tuple(UINT64_MAX, 0UL, 0UL, Lookup{0, {}}));
+  EXPECT_FALSE(empty.highestAbsTime().has_value());
+}
+
+TEST_F(TimeTest, WalksGivePositionWallAndAbsoluteTimeAndOnlyPlainWalksStop) {
+  auto t = twoSegments();  // positions 0, 50, 100, 700, 750, 800
+  EXPECT_EQ(calls(*t, nullptr, 4),
+            (Calls{{1000, 10000, 0}, {1050, 10050, 50}, {1100, 10100, 100}, {1700, 10700, 200}}));
+  std::size_t count = 0;  // a plain walk answers whether it was stopped
+  EXPECT_TRUE(t->enumerateEventsUsingBlock([&](auto&, auto, auto, auto&, bool& stop) { stop = ++count == 6; }));
+  EXPECT_FALSE(t->enumerateEventsUsingBlock([&](auto&, auto, auto, auto&, bool&) { ++count; }));
+  EXPECT_EQ(count, 12u);
+  const std::vector<Range> twoRanges{{50, 1}, {750, 51}}, one{{700, 100}};  // a range's end is not inside it
+  EXPECT_EQ(calls(*t, &twoRanges), (Calls{{50, 10050, 50}, {750, 10750, 250}, {800, 10800, 300}}));
+  EXPECT_EQ(calls(*t, &one), (Calls{{700, 10700, 200}, {750, 10750, 250}}));
+}
+
+TEST_F(TimeTest, LookupsFollowChangesMadeAfterAnEarlierLookup) {
+  auto t = std::make_unique<Timeline>(), inner = std::make_unique<Timeline>();
+  AbsoluteTimeline* segmentA = segment({{0, 10000}, {100, 0}}).release();
+  inner->addObject(std::unique_ptr<Timeline>(segmentA));
+  t->addObject(std::move(inner));
+  EXPECT_EQ(t->duration(), 100u);
+  segmentA->addObject(idle(150));
+  EXPECT_EQ(std::pair(t->duration(), t->wallTimeForRelative(150)), std::pair(std::uint64_t{150}, std::uint64_t{10150}));
+  segmentA->adjustSkew(-10000);
+  EXPECT_EQ(t->wallTimeForRelative(150), 150u);
+  t->addObject(segment({{1000, 20000}}));  // starts 19850 ms of wall clock after the first child
+  EXPECT_EQ(t->duration(), 150u + 19850u);
+}
+
+// --- the literal walk: child offsets worked out step by step ---------------
+
+std::uint64_t literalDuration(const Timeline& t);
+
+// Children with their offsets: the first at `offset`, each later one after
+// the previous one's span plus the wall-clock gap, if any.
+std::vector<std::pair<const Timeline*, std::uint64_t>> literalChildren(const Timeline& t, std::uint64_t offset) {
+  std::vector<std::pair<const Timeline*, std::uint64_t>> result;
+  const Timeline* previous = nullptr;
+  for (const auto& child : t.objects()) {
+    if (previous && child->startWallTime() > previous->endWallTime())
+      offset += child->startWallTime() - previous->endWallTime();
+    result.emplace_back(child.get(), offset);
+    offset += literalDuration(*child);
+    previous = child.get();
+  }
+  return result;
+}
+
+std::uint64_t literalDuration(const Timeline& t) {
+  if (auto s = dynamic_cast<const AbsoluteTimeline*>(&t)) return s->endAbsoluteTime() - s->startAbsoluteTime();
+  std::uint64_t longest = 0;
+  for (auto [child, x] : literalChildren(t, 0)) longest = std::max(longest, x + literalDuration(*child));
+  return longest;
+}
+
+// The wall time: the first child's, or in a gap run on from the start of the child before
+// it. The absolute time: the first child's, up to the first child past the position.
+Lookup literalLookup(const Timeline& t, std::uint64_t p, std::uint64_t offset) {
+  if (auto s = dynamic_cast<const AbsoluteTimeline*>(&t)) return lookup(*s, p, offset);
+  Lookup result{0, std::nullopt};
+  std::pair<const Timeline*, std::uint64_t> prev{nullptr, 0};
+  for (auto [child, x] : literalChildren(t, offset)) {
+    if (p < x) {
+      if (result.first == 0) result.first = (prev.first ? prev.first->startWallTime() : 0) + p - prev.second;
+      break;
+    }
+    auto [wall, abs] = literalLookup(*child, p, x);
+    result = {result.first ? result.first : wall, result.second ? result.second : abs};
+    prev = {child, x};
+  }
+  return result;
+}
+
+std::vector<Range> literalRanges(const Timeline& t, std::uint64_t from, std::uint64_t to, std::uint64_t offset) {
+  if (auto s = dynamic_cast<const AbsoluteTimeline*>(&t)) return spans(s->absoluteRangesForRelative(from, to, offset));
+  std::vector<Range> result;
+  for (auto [child, x] : literalChildren(t, offset)) {
+    auto part = literalRanges(*child, from, to, x);
+    if (part.empty() && !result.empty()) break;
+    result.insert(result.end(), part.begin(), part.end());
+  }
+  return result;
+}
+
+void literalRangeWalk(const Timeline& t, const std::vector<Range>& ranges, std::uint64_t offset,
+                      std::vector<std::uint64_t>& positions) {
+  auto s = dynamic_cast<const AbsoluteTimeline*>(&t);
+  if (s == nullptr) {
+    for (auto [child, x] : literalChildren(t, offset)) literalRangeWalk(*child, ranges, x, positions);
+    return;
+  }
+  for (const Record* r : s->records()) {
+    const std::uint64_t p = offset + (r->absoluteTime() - s->startAbsoluteTime());
+    if (p > (ranges.empty() ? 0 : ranges.back().end())) return;
+    if (std::any_of(ranges.begin(), ranges.end(), [p](const Range& range) { return range.contains(p); }))
+      positions.push_back(p);
+  }
+}
+
+// Random boots of segments overlapping, touching and apart in wall time, some of zero length.
+TEST_F(TimeTest, LookupsRangesAndRangeWalksAnswerAsTheLiteralWalk) {
+  for (unsigned seed = 1; seed <= 40; ++seed) {
+    SCOPED_TRACE(seed);
+    std::mt19937 rng(seed);
+    auto pick = [&](std::uint64_t lo, std::uint64_t hi) { return std::uniform_int_distribution(lo, hi)(rng); };
+    std::vector<std::unique_ptr<Timeline>> boots;
+    std::uint64_t wall = 100000;
+    for (std::uint64_t b = 0, n = pick(1, 6); b < n; ++b) {
+      auto& boot = boots.emplace_back(std::make_unique<Timeline>());
+      for (std::uint64_t k = 0, m = pick(1, 4), abs = pick(0, 50); k < m; ++k) {
+        wall = wall + pick(0, 90) - 30;
+        auto s = std::make_unique<AbsoluteTimeline>(nullptr);
+        for (std::uint64_t r = 0, skew = wall - abs, records = pick(1, 4); r < records; ++r, abs += pick(0, 20))
+          s->addObject(at(abs, r == 0 ? abs + skew : 0));
+        wall = s->endWallTime();
+        abs = s->endAbsoluteTime() + pick(0, 5);
+        boot->addObject(std::move(s));
+      }
+    }
+    const auto t = Timeline::timelineWithTimelines(std::move(boots));
+    ASSERT_EQ(t->duration(), literalDuration(*t));
+    for (std::uint64_t offset : {0u, 7u})
+      for (std::uint64_t p = 0; p <= t->duration() + offset + 2; ++p)
+        ASSERT_EQ(lookup(*t, p, offset), literalLookup(*t, p, offset)) << p;
+    const std::uint64_t end = t->duration() + 3;
+    for (int trial = 0; trial < 300; ++trial) {
+      const std::uint64_t from = pick(0, end), to = pick(from, end);
+      ASSERT_EQ(spans(t->absoluteRangesForRelative(from, to, 0)), literalRanges(*t, from, to, 0)) << from << ".." << to;
+    }
+    for (int trial = 0; trial < 100; ++trial) {
+      std::vector<Range> ranges;
+      for (std::uint64_t i = 0, at = pick(0, end / 2), n = pick(0, 4); i < n && at <= end; ++i) {
+        ranges.push_back(Range{at, pick(0, end / 4 + 1)});
+        at += ranges.back().length + pick(0, end / 4 + 1);
+      }
+      std::vector<std::uint64_t> fast, slow;
+      t->enumerateEventsInRelativeRanges(ranges,
+                                         [&](auto&, std::uint64_t p, auto, auto&, bool&) { fast.push_back(p); });
+      literalRangeWalk(*t, ranges, 0, slow);
+      ASSERT_EQ(fast, slow);
+    }
+  }
+}
+
+// A boot's segments: a new one wherever the wall clock jumps against the ticks; those
+// written before the clock was set are moved onto its first reading after 2013.
+TEST_F(TimeTest, SleepsAndClockChangesStartSegmentsAndAClockSetLateMovesTheEarlierOnes) {
+  const std::uint64_t cut = BootTimeline::kClockSetWallTime;
+  EXPECT_EQ(cut, 1356998400000u);  // 2013-01-01
+  const std::int64_t w = kWall, cutOff = cut;
+  const std::tuple<const char*, Records, List, std::vector<std::int64_t>> cases[] = {  // positions, skews
+      {"asleep for an hour: the ticks advance 50 ms, the wall clock 3,600,050",
+       {header(1000, kWall), idle(5000), wake(10000, kWall + 9000), wake(10050, kWall + 3609050), idle(12050)},
+       {0, 4000, 9000, 3609050, 3611050}, {w - 1000, w + 3609050 - 10050}},
+      {"a clock set back by the ticks since: a touching segment", {header(0, kWall), idle(8000),
+       clockSet(9000, kWall + 8000), idle(9500)}, {0, 8000, 8000, 8500}, {w, w + 8000 - 9000}},
+      {"a 1970 header (skew 5000) and the clock set at tick 300", {header(100, 5100), idle(200),
+       clockSet(300, kWall)}, {0, 100, 200}, {w - 300}},
+      {"every segment before the clock was set moves by as much", {header(100, 5100), wake(200, 9200),
+       clockSet(300, kWall)}, {0, 4100, 4200}, {w - 4300, w - 300}},  // one ends at w - 4200, one starts at w - 100
+      // The first clock after the cut-off (at tick 400) moves the first two
+      // segments; the first, moved as far, still ends long before the second.
+      {"only the first clock after the cut-off moves them", {header(100, 5100), clockSet(300, cut),
+       clockSet(400, kWall), wake(500, kWall + 10000)}, {0, cut - 5100, cut - 5000, cut + 5000},
+       {5000 + (w - 400) - (cutOff - 300), w - 400, w + 9500}}};
+  for (const auto& [what, events, expectedPositions, skews] : cases) {
+    BootTimeline boot(kA, events);
+    std::vector<std::int64_t> actual;
+    for (std::size_t i = 0; i < boot.segmentCount(); ++i) actual.push_back(boot.segment(i).skew());
+    EXPECT_EQ(actual, skews) << what;
+    EXPECT_EQ(positions(boot), expectedPositions) << what;
+  }
+  BootTimeline sleep(kA, std::get<1>(cases[0])), touching(kA, std::get<1>(cases[1]));
+  EXPECT_EQ(std::tuple(sleep.startWallTime(), sleep.endWallTime(), sleep.duration(), sleep.segment(0).boot()),
+            std::tuple(kWall, kWall + 3611050, std::uint64_t{3611050}, &sleep));
+  // The wake's position has a wall time but no absolute time, and so has the
+  // gap, whose wall time runs on from the first segment's start.
+  for (std::uint64_t p : {9001, 3609050}) EXPECT_EQ(lookup(sleep, p, 0), (Lookup{kWall + p, {}})) << p;
+  EXPECT_EQ(pairOf(*sleep.absoluteTimeForRelative(3609051)), std::pair(kA, std::uint64_t{10051}));
+  // Where segments touch, the first answers at the shared position, with its own last tick.
+  EXPECT_EQ(touching.absoluteTimeForRelative(8000)->time, 8000u);
+  EXPECT_EQ(touching.absoluteTimeForRelative(8001)->time, 9001u);
+  EXPECT_EQ(touching.absoluteRangesForRelativeRange(Range{4000, 4250}).back().range(), (Range{9000, 250}));
+}
+
+TEST_F(TimeTest, BootsApartInWallTimeKeepTheGapAndOverlappingBootsDoNot) {
+  const std::tuple<const char*, std::uint64_t, std::uint64_t> cases[] = {  // second start, its offset
+      {"ten minutes apart", kWall + 60000 + 600000, 60000 + 600000},
+      {"overlapping", kWall + 30000, 60000},
+      {"back to back", kWall + 60000, 60000}};
+  for (auto [what, secondStart, secondOffset] : cases) {
+    std::vector<std::unique_ptr<Timeline>> boots;
+    boots.push_back(std::make_unique<BootTimeline>(kA, Records{header(0, kWall), idle(60000)}));
+    boots.push_back(std::make_unique<BootTimeline>(kB, kA, Records{header(0, secondStart), idle(1000)}));
+    auto timeline = Timeline::timelineWithTimelines(std::move(boots));
+    List offsets;
+    timeline->enumerateTimelinesWithOffset(0, [&](auto&, std::uint64_t x, bool&) { offsets.push_back(x); });
+    EXPECT_EQ(offsets, (List{0, secondOffset})) << what;
+    EXPECT_EQ(std::tuple(timeline->duration(), timeline->startWallTime(), timeline->endWallTime()),
+              std::tuple(secondOffset + 1000, kWall, secondStart + 1000)) << what;
+  }
+}
+
+TEST_F(TimeTest, TheChainEndingLatestIsKeptPerSystemVersionAndTheOtherBootsAreListed) {
+  // A boot starting `start` ms after kWall and lasting `length`.
+  struct Boot { Uuid id; std::uint64_t start, length; std::optional<Uuid> last; const char* version = "23A344"; };
+  const std::tuple<const char*, std::vector<Boot>, std::string> cases[] = {
+      {"A, B, C chained; D unrelated and over before C",
+       {{kA, 0, 1000}, {kB, 10000, 1000, kA}, {kC, 20000, 1000, kB}, {kD, 5000, 500}},
+       "23A344: 01 02 03\n" + warning({kD})},
+      {"a lone boot ending later beats a longer chain",
+       {{kA, 0, 1000}, {kB, 10000, 1000, kA}, {kC, 20000, 1000, kB}, {kD, 5000, 100000}},
+       "23A344: 04\n" + warning({kA, kB, kC})},
+      {"on equal ends the longer chain wins", {{kA, 0, 1000}, {kB, 10000, 1000, kA}, {kD, 5000, 6000}},
+       "23A344: 01 02\n" + warning({kD})},
+      {"then the lower UUID", {{kD, 0, 1000}, {kC, 0, 1000}}, "23A344: 03\n" + warning({kD})},
+      {"one chain per version", {{kA, 0, 1000}, {kB, 10000, 1000, kA, "23B74"}, {kC, 20000, 1000, kB, nullptr}},
+       "23A344: 01\n23B74: 02\n<unknown>: 03\n"}};
+  for (const auto& [what, boots, expected] : cases) {
+    boots_.clear();
+    for (const Boot& b : boots)
+      boots_[b.id] = {header(0, kWall + b.start, b.version, b.last), idle(b.length)};
+    EXPECT_EQ(sequenced(), expected) << what;
+  }
+  const std::vector<std::pair<Uuid, Uuid>> loops[] = {  // boot, its previous boot
+      {{kA, kB}, {kB, kA}}, {{kA, kA}}, {{kA, kB}, {kB, kC}, {kC, kB}, {kD, kA}}};
+  for (const auto& links : loops) {
+    boots_.clear();
+    for (auto [id, last] : links) boots_[id] = {header(0, kWall, "23A344", last), idle(1000)};
+    EXPECT_EQ(thrownText([&] { sequenceBoots(boots_); }),
+              "NSInternalInconsistencyException: boot uuid cycle detected");
+  }
+}
+
+TEST_F(TimeTest, ABootIsSortedByAbsoluteTimeKeepingTiesInOrderAndBeginsWithAVersionOneHeader) {
+  const Records invalid[] = {{}, {idle(0), header(10, kWall)}, {&make<LogStartsV0>(0, kWall)}};
+  for (const Records& events : invalid)
+    EXPECT_EQ(thrownText([&] { BootTimeline b(kA, events); }),
+              "NSInvalidArgumentException: invalid event stream detected");
+  BootTimeline named(kA, kB, Records{header(0, kWall)}), unnamed(kA, Records{header(0, kWall, nullptr)});
+  EXPECT_EQ(std::tuple(named.uuid(), *named.lastUUID(), *named.systemVersion()), std::tuple(kA, kB, "23A344"));
+  EXPECT_FALSE(unnamed.lastUUID().has_value() || unnamed.systemVersion().has_value());
+  Record *last = idle(500), *early = idle(300), *late = idle(300), *first = header(0, kWall);
+  boots_[kA] = {last, early, first, late};
+  sequenceBoots(boots_);
+  EXPECT_EQ(boots_[kA], (Records{first, early, late, last}));
+}
+
+// A run of boots with sleeps, a clock set back, a clock set late and a boot that cannot
+// be chained: every record's position leads back to its wall time and absolute time.
+TEST_F(TimeTest, EveryRecordsPositionMapsBackToItsWallTimeAndAbsoluteTime) {
+  // A: an hour's sleep after tick 3000, then the clock set back so that the
+  // third segment touches the second. Ends at wall kWall + 3610500.
+  boots_[kA] = {header(1000, kWall), idle(2000),  idle(3000), wake(3500, kWall + 3602500), idle(4000),
+                idle(8000), clockSet(9000, kWall + 3607000), idle(9500), idle(12500)};
+  const std::uint64_t bStart = kWall + 3610500 + 600000;  // B: ten minutes after A, with one sleep
+  boots_[kB] = {header(500, bStart, "23A344", kA), idle(700), wake(800, bStart + 90300), idle(5000)};
+  // C: starts on a 1970 clock that is set at tick 300.
+  boots_[kC] = {header(100, 5100, "23A344", kB), idle(200), clockSet(300, bStart + 200000), idle(900)};
+  boots_[kD] = {header(0, kWall - 100000), idle(10)};
+  std::map<const Record*, Uuid> bootOf;
+  for (const auto& [id, records] : boots_)
+    for (const Record* r : records) bootOf[r] = id;
+  auto timelines = sequenceBoots(boots_);
+  EXPECT_EQ(out_.str(), warning({kD}));
+  const Timeline& timeline = *timelines.at("23A344");
+  std::set<std::uint64_t> segmentStarts;  // where each segment starts, and its extent in absolute time
+  std::vector<std::pair<Uuid, Range>> segmentSpans;
+  timeline.enumerateTimelinesWithOffset(0, [&](const Timeline& boot, std::uint64_t offset, bool&) {
+    boot.enumerateTimelinesWithOffset(offset, [&](const Timeline& child, std::uint64_t x, bool&) {
+      const auto& segment = static_cast<const AbsoluteTimeline&>(child);
+      segmentStarts.insert(x);
+      segmentSpans.emplace_back(segment.bootUuid(), Range{segment.startAbsoluteTime(), segment.duration()});
+    });
+  });
+  EXPECT_EQ(segmentSpans.size(), 6u);  // A: 3, B: 2, C: 1
+  std::size_t walked = 0, absChecked = 0;
+  std::uint64_t lastPosition = 0;
+  timeline.enumerateEventsUsingBlock([&](const Record& r, std::uint64_t position, std::uint64_t wall,
+                                         const AbsTime& abs, bool&) {
+    ++walked;
+    EXPECT_GE(position, lastPosition);
+    lastPosition = position;
+    EXPECT_EQ(pairOf(abs), std::pair(bootOf.at(&r), r.absoluteTime()));
+    EXPECT_TRUE(r.wallTime() <= BootTimeline::kClockSetWallTime || wall == r.wallTime()) << position;
+    EXPECT_EQ(timeline.wallTimeForRelative(position), wall) << position;
+    if (segmentStarts.count(position) == 0 && ++absChecked) {
+      EXPECT_EQ(lookup(timeline, position, 0).second, abs.time) << position;
+    }
+  });
+  EXPECT_EQ(walked, 9u + 4u + 4u);
+  EXPECT_EQ(absChecked, walked - 6 - 1);  // the touching segment's start holds two records
+  std::vector<std::pair<Uuid, Range>> ranges;
+  for (const AbsRange& r : timeline.absoluteRangesForRelativeRange(Range{0, timeline.duration()}))
+    ranges.emplace_back(r.boot(), r.range());
+  EXPECT_EQ(ranges, segmentSpans);
+}
+
+TEST(AbsRange, SpansTwoTimesOfOneBootAndRaisesWithThemInTheUserInfo) {
+  EXPECT_EQ(AbsRange::rangeWithBoot(kA, 7, 7).range(), (Range{7, 0}));  // equal ends: empty
+  auto e = thrown([&] { AbsRange::rangeWithBoot(kA, 10, 5); });
+  ASSERT_TRUE(e.has_value());
+  EXPECT_EQ(e->name() + ": " + e->reason(), "NSInvalidArgumentException: end < start");
+  EXPECT_EQ(std::any_cast<std::uint64_t>(e->userInfo().at("start")), 5u);  // start and end swapped
+  EXPECT_EQ(std::any_cast<std::uint64_t>(e->userInfo().at("end")), 10u);
+  EXPECT_EQ(std::any_cast<Uuid>(e->userInfo().at("boot")), kA);
+  const AbsTime a = AbsTime::timeWithBoot(kA, 100), b = AbsTime::timeWithBoot(kB, 100);
+  e = thrown([&] { AbsRange::rangeFromTime(&a, &b); });  // equal times, two boots
+  ASSERT_TRUE(e.has_value());
+  EXPECT_EQ(e->name() + ": " + e->reason(), "NSInvalidArgumentException: start.boot != end.boot");
+  EXPECT_EQ(std::any_cast<AbsTime>(e->userInfo().at("end")).boot, kB);
+}
+
+// The calendar reads the zone once, on first use: fix it before any test of
+// this binary runs.
+const bool kZoneSet = [] { return setenv("TZ", "America/New_York", 1) == 0 && (tzset(), true); }();
+
+TEST(Calendar, DaysAndMidnightsAreLocalAcrossDaylightSaving) {
+  ASSERT_TRUE(kZoneSet);
+  // Noon in New York a calendar day apart: 23 hours when the clocks go
+  // forward, 25 when they go back, 24 on a plain day.
+  const std::pair<double, double> days[] = {{1678554000, 1678636800},   // 2023-03-11 12:00 EST, 03-12 12:00 EDT
+                                            {1699113600, 1699203600},   // 2023-11-04 12:00 EDT, 11-05 12:00 EST
+                                            {1699203600, 1699290000}};  // 2023-11-05 12:00 EST, 11-06 12:00 EST
+  for (auto [from, later] : days) {
+    EXPECT_EQ(dateOneDayLater(Date{from}).secondsSince1970, later);
+    EXPECT_EQ(dateOneDayEarlier(Date{later}).secondsSince1970, from);
+  }
+  // 2023-03-12 00:00 EST is 05:00 UTC; 15:30 EDT that day is 19:30 UTC.
+  EXPECT_EQ(earlierMidnight(Date{1678649400}).secondsSince1970, 1678597200);
+  EXPECT_EQ(earlierMidnight(Date{1678597200}).secondsSince1970, 1678597200);
+  // 2023-11-05 01:30 EDT, before the clocks go back: midnight EDT (04:00 UTC).
+  EXPECT_EQ(earlierMidnight(Date{1699162200.75}).secondsSince1970, 1699156800);
+  // 2023-03-12 03:30 UTC is still the 11th in New York; day 0 is the last of the month before.
+  EXPECT_EQ(yearMonthDayFromDate(Date{1678591800}), (YearMonthDay{2023, 3, 11}));
+  EXPECT_EQ(dateFromYearMonthDay({2023, 3, 12}).secondsSince1970, 1678597200);
+  EXPECT_EQ(yearMonthDayFromDate(dateFromYearMonthDay({2024, 3, 0})), (YearMonthDay{2024, 2, 29}));
+}
+
+}  // namespace
+}  // namespace bw
