@@ -1,12 +1,14 @@
 #pragma once
 // A week-long store of a small laptop, generated once per test process and
 // read back with the record reader, for the tests that look at its contents.
+#include <memory>
 #include <string>
 #include <vector>
 
 #include "SampleStore.h"
 #include "store/RecordReader.h"
 #include "support/TempDir.h"
+#include "time/BootSequencer.h"
 
 namespace bw::samplestore::test {
 
@@ -15,14 +17,25 @@ struct SharedStore {
   StoreConfig config;
   StoreReport report;
   RecordsByBoot read;
-  // Each boot's records sorted by absolute time, boots in the order written.
-  std::vector<std::vector<Record*>> boots;
+  std::vector<std::vector<Record*>> boots;  // per boot, sorted by absolute time, in the order written
 };
 
-const SharedStore& sharedStore();
-
-// Reads a store the way `--from DIR` does.
-RecordsByBoot readStore(const std::string& directory);
+inline const SharedStore& sharedStore() {
+  static const std::unique_ptr<SharedStore> store = [] {
+    auto s = std::make_unique<SharedStore>();
+    s->config = StoreConfig{.days = 7, .seed = 11, .scale = 30, .output = s->dir / "store"};  // a trip, a weekend and the update
+    s->report = generateSampleStore(s->config);
+    Options options;
+    options.setFrom_path(s->config.output);
+    s->read = readAllRecords(options);
+    for (const BootSummary& boot : s->report.boots) {
+      s->boots.push_back(s->read.boots[boot.uuid]);
+      sortByAbsoluteTime(s->boots.back());
+    }
+    return s;
+  }();
+  return *store;
+}
 
 // The records of class T among `records`, in order.
 template <class T>
