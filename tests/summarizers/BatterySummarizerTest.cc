@@ -81,17 +81,18 @@ TEST(BatterySummary, UnknownChargeHalvesRangesOfAtLeast60002Milliseconds) {
     }
     Ranges seen;
   } s;
-  summarize(s, {0, 60001});
-  EXPECT_EQ(s.seen, (Ranges{{0, 60001}}));
-  s.seen.clear();
-  summarize(s, {0, 60002});
-  EXPECT_EQ(s.seen, (Ranges{{0, 60002}, {0, 30001}, {30001, 30001}}));
-  s.seen.clear();
-  const PowerSummary p = summarize(s, {0, 120005});  // an odd last millisecond is dropped
-  EXPECT_EQ(s.seen, (Ranges{{0, 120005}, {0, 60002}, {0, 30001}, {30001, 30001}, {60002, 60002}, {60002, 30001},
-                            {90003, 30001}}));
-  EXPECT_EQ(p.deltaCharge(), 0);
-  EXPECT_EQ(p.range(), (Range{0, 120005}));
+  for (const auto& [length, halves] : std::vector<std::pair<std::uint64_t, Ranges>>{
+           {60001, {}},
+           {60002, {{0, 30001}, {30001, 30001}}},
+           {120005, {{0, 60002}, {0, 30001}, {30001, 30001}, {60002, 60002}, {60002, 30001}, {90003, 30001}}}}) {  // an odd last millisecond is dropped
+    s.seen.clear();
+    const PowerSummary p = summarize(s, {0, length});
+    Ranges expected{{0, length}};
+    expected.insert(expected.end(), halves.begin(), halves.end());
+    EXPECT_EQ(s.seen, expected) << length;
+    EXPECT_EQ(p.deltaCharge(), 0);
+    EXPECT_EQ(p.range(), (Range{0, length}));
+  }
 }
 
 TEST(BatteryFeed, SecondSampleAfterAWakeExtendsTheCurvesBackToTheWake) {
@@ -157,10 +158,7 @@ TEST(BatteryModel, TopPowerSummariesPutTheHeaviestDrainFirst) {
   EXPECT_DOUBLE_EQ(average(*top[1]), -6000);
   EXPECT_EQ(average(*top[2]), 0);
   PowerSummary a, b;
-  a.setAvgPowerNumer(-1);
-  a.setAvgPowerDenom(3);
-  b.setAvgPowerNumer(-2);
-  b.setAvgPowerDenom(6);
+  a.setAvgPowerNumer(-1), a.setAvgPowerDenom(3), b.setAvgPowerNumer(-2), b.setAvgPowerDenom(6);
   EXPECT_EQ(power.comparator()(a, b), 0);  // equal within the double epsilon
 }
 

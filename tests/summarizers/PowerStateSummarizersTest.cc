@@ -15,31 +15,15 @@ using Ranges = std::vector<Range>;
 // Every model summarizer fed the same records; ranges by key.
 class States {
  public:
-  States() {
-    for (auto& [key, s] : makeModelSummarizers()) all[key] = std::move(s);
-  }
-  void add(const Record& r, std::uint64_t position, std::uint8_t bootNumber = 1) {
-    for (auto& [key, s] : all) test::feed(*s, r, position, bootNumber);
-  }
-  void finish(std::uint64_t last) {
-    for (auto& [key, s] : all) s->setLastPosition(last);
-  }
+  States() { for (auto& [key, s] : makeModelSummarizers()) all[key] = std::move(s); }
+  void add(const Record& r, std::uint64_t position, std::uint8_t bootNumber = 1) { for (auto& [key, s] : all) test::feed(*s, r, position, bootNumber); }
+  void finish(std::uint64_t last) { for (auto& [key, s] : all) s->setLastPosition(last); }
   Ranges operator[](const std::string& key) const { return all.at(key)->ranges(); }
   std::map<std::string, std::unique_ptr<Summarizer>> all;
 };
 
 // A device type nobody follows: it only marks a record's position.
 const DeviceChange kNeutral = test::device(1, 1);
-
-TEST(ModelSummarizers, EachKeyHoldsItsKindWithItsOwnIdentifier) {
-  const States states;
-  const std::map<std::string, std::string> identifiers = {
-      {"A/C", "ACPower"}, {"Battery", "BatteryPower"}, {"Active", "Active"}, {"Idle", "Idle"},
-      {"Sleep", "Sleep"}, {"Wake", "Wake"}, {"DarkWake", "DarkWake"}, {"Bluetooth", "Bluetooth"},
-      {"DiscreteGraphics", "DiscreteGraphics"}, {"Wi-Fi", "Wi-Fi"}, {"Power", ""}, {"Standby", ""}};
-  ASSERT_EQ(states.all.size(), identifiers.size());
-  for (const auto& [key, identifier] : identifiers) EXPECT_EQ(states.all.at(key)->identifier(), identifier) << key;
-}
 
 TEST(PowerStates, SleepThenDarkWakeThenWakeSplitTheTimeline) {
   States states;
@@ -65,9 +49,7 @@ TEST(PowerStates, OnlyWakeAndActiveStartAtBootAndEveryStateEndsAtShutdown) {
   EXPECT_EQ(states["Wake"], (Ranges{{10, 10}, {40, 20}}));
   EXPECT_EQ(states["Active"], (Ranges{{10, 20}, {40, 20}}));
   EXPECT_EQ(states["Sleep"], (Ranges{{20, 10}}));  // closed at boot 1's last record
-  for (const char* key : {"A/C", "Battery", "Idle", "DarkWake", "Wi-Fi", "Bluetooth", "DiscreteGraphics"}) {
-    EXPECT_TRUE(states[key].empty()) << key;
-  }
+  for (const char* key : {"A/C", "Battery", "Idle", "DarkWake", "Wi-Fi", "Bluetooth", "DiscreteGraphics"}) EXPECT_TRUE(states[key].empty()) << key;
 }
 
 TEST(PowerStates, PowerSourceAndUserIdleFollowTheirCodes) {
