@@ -116,9 +116,9 @@ class TimeTest : public testing::Test {
 
 
   // A segment of (absolute time, wall time) records; wall time 0 is none.
-  std::unique_ptr<AbsoluteTimeline> segment(std::initializer_list<std::pair<std::uint64_t, std::uint64_t>> spec) {
+  std::unique_ptr<AbsoluteTimeline> segment(std::initializer_list<std::pair<std::uint64_t, std::uint64_t>> samples) {
     auto s = std::make_unique<AbsoluteTimeline>(nullptr);
-    for (auto [abs, wall] : spec) s->addObject(at(abs, wall));
+    for (auto [abs, wall] : samples) s->addObject(at(abs, wall));
     return s;
   }
   // A: ticks 0..100 at wall 10000..10100. B: ticks 200..300 from wall
