@@ -41,7 +41,9 @@ TEST(Standby, SleepEndedByAWakeFromStandbyIsARangeAndCountsByWakeType) {
   EXPECT_EQ(summary.duration(), 150u);
   EXPECT_EQ(summary.wakesFromStandby(), 2u);
   // Wakes count after the range start up to and including its end.
-  EXPECT_EQ(summarize(s, {40, 10}).wakeTypes(), (Counts{{"RTC", 1}}));
+  const StandbySummary rtc = summarize(s, {40, 10});
+  EXPECT_EQ(rtc.wakeTypes(), (Counts{{"RTC", 1}}));
+  EXPECT_EQ(rtc.darkWakesFromStandby(), 0u);  // the full wake at 50 is not dark
   EXPECT_EQ(summarize(s, {50, 10}).wakeTypes(), (Counts{{"RTC", 0}}));
 }
 
