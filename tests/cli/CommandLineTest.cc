@@ -133,7 +133,17 @@ TEST_F(CommandLine, DailyFromAShellNeedsDebugBeforeIt) {
 TEST_F(CommandLine, LocalRecordsWithoutTheSuperUserExit77) {
   test::RunSettings user;
   user.asUnprivilegedUser = true;
-  std::filesystem::permissions(store.path(), std::filesystem::perms::all);
+  user.env.emplace("TZ", "UTC");
+  namespace fs = std::filesystem;
+  fs::permissions(store.path(), fs::perms::all);
+  // A copy the unprivileged user can surely reach, wherever the build lives.
+  test::TempDir bin;
+  fs::permissions(bin.path(), fs::perms::all);
+  const std::string tool = bin / "brindlewick";
+  fs::copy_file(BRINDLEWICK_BINARY, tool);
+  auto run = [&](const std::vector<std::string>& args, const test::RunSettings& settings) {
+    return test::runBinary(tool, args, settings);
+  };
   ToolResult r = run({"-L"}, user);
   EXPECT_EQ(r.status, 77);
   EXPECT_EQ(r.out, "");
