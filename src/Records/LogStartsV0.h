@@ -21,21 +21,10 @@ class LogStartsV0 final : public Record {
 
   // The record carries a wall time of its own.
   bool answersWallTime() const override { return true; }
-  // The boot named by `bootUuid` / `lastBootUuid` (see BootUuidBytes.h), or
-  // the value given by the setter, which wins while it holds one.
-  std::optional<Uuid> bootUUID() const {
-    return bootUUID_ ? bootUUID_ : uuidFromBootUuidBytes(bootUuid_, hasBootUuid());
-  }
-  void setBootUUID(std::optional<Uuid> uuid) { bootUUID_ = uuid; }
-  std::optional<Uuid> lastBootUUID() const {
-    return lastBootUUID_ ? lastBootUUID_ : uuidFromBootUuidBytes(lastBootUuid_, hasLastBootUuid());
-  }
-  void setLastBootUUID(std::optional<Uuid> uuid) { lastBootUUID_ = uuid; }
 
  private:
   BW_RECORD_STORAGE(BW_LOG_STARTS_V0_FIELDS, BW_NO_REPEATED_FIELDS)
-  std::optional<Uuid> bootUUID_;
-  std::optional<Uuid> lastBootUUID_;
+  BW_LOG_START_BOOT_UUIDS
 };
 
 }  // namespace bw

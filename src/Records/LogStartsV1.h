@@ -25,16 +25,6 @@ class LogStartsV1 final : public Record {
 
   // The record carries a wall time of its own.
   bool answersWallTime() const override { return true; }
-  // The boot named by `bootUuid` / `lastBootUuid` (see BootUuidBytes.h), or
-  // the value given by the setter, which wins while it holds one.
-  std::optional<Uuid> bootUUID() const {
-    return bootUUID_ ? bootUUID_ : uuidFromBootUuidBytes(bootUuid_, hasBootUuid());
-  }
-  void setBootUUID(std::optional<Uuid> uuid) { bootUUID_ = uuid; }
-  std::optional<Uuid> lastBootUUID() const {
-    return lastBootUUID_ ? lastBootUUID_ : uuidFromBootUuidBytes(lastBootUuid_, hasLastBootUuid());
-  }
-  void setLastBootUUID(std::optional<Uuid> uuid) { lastBootUUID_ = uuid; }
 
   // "LogStartsV1\t<systemVersion>\t<bootUUID>\t<lastBootUUID>", each empty
   // when absent.
@@ -42,8 +32,7 @@ class LogStartsV1 final : public Record {
 
  private:
   BW_RECORD_STORAGE(BW_LOG_STARTS_V1_FIELDS, BW_NO_REPEATED_FIELDS)
-  std::optional<Uuid> bootUUID_;
-  std::optional<Uuid> lastBootUUID_;
+  BW_LOG_START_BOOT_UUIDS
 };
 
 }  // namespace bw
