@@ -44,7 +44,7 @@ inline long runToolQuietly(const char* const* args) {
     _exit(127);
   }
   int status = 0;
-  rusage usage {};
+  rusage usage{};
   wait4(pid, &status, 0, &usage);
   if (!WIFEXITED(status) || WEXITSTATUS(status) != 0) return -1;
   return usage.ru_maxrss;

@@ -88,8 +88,7 @@ void BM_LedgerTimeOverRange(benchmark::State& state) {
   auto positions = randomPositions(l.maxPosition());
   std::size_t i = 0;
   for (auto _ : state) {
-    benchmark::DoNotOptimize(
-        l.timeValueWasGreaterThanZeroOverRange({positions[i++ & 0xFFFF], l.maxPosition() / 10}));
+    benchmark::DoNotOptimize(l.timeValueWasGreaterThanZeroOverRange({positions[i++ & 0xFFFF], l.maxPosition() / 10}));
   }
   state.SetItemsProcessed(static_cast<std::int64_t>(state.iterations()));
 }

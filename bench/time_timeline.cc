@@ -123,8 +123,8 @@ void BM_EnumerateEvents(benchmark::State& state) {
   const bw::Timeline& t = timeline();
   for (auto _ : state) {
     std::uint64_t sum = 0;
-    t.enumerateEventsUsingBlock([&](const bw::Record&, std::uint64_t p, std::uint64_t w, const bw::AbsTime&,
-                                    bool&) { sum += p ^ w; });
+    t.enumerateEventsUsingBlock(
+        [&](const bw::Record&, std::uint64_t p, std::uint64_t w, const bw::AbsTime&, bool&) { sum += p ^ w; });
     benchmark::DoNotOptimize(sum);
   }
   state.SetItemsProcessed(std::int64_t(state.iterations()) * std::int64_t(run().records));

@@ -21,17 +21,17 @@ std::optional<Uuid> uuidFromBootUuidBytes(const std::string& bytes, bool present
 // The derived `bootUUID` / `lastBootUUID` of the log-start records: the boot
 // named by the byte field, or the value given by the setter, which wins while
 // it holds one. Placed last in the class body.
-#define BW_LOG_START_BOOT_UUIDS                                                                      \
- public:                                                                                             \
-  std::optional<Uuid> bootUUID() const {                                                             \
-    return bootUUID_ ? bootUUID_ : uuidFromBootUuidBytes(bootUuid_, hasBootUuid());                  \
-  }                                                                                                  \
-  void setBootUUID(std::optional<Uuid> uuid) { bootUUID_ = uuid; }                                   \
-  std::optional<Uuid> lastBootUUID() const {                                                         \
+#define BW_LOG_START_BOOT_UUIDS                                                                     \
+ public:                                                                                            \
+  std::optional<Uuid> bootUUID() const {                                                            \
+    return bootUUID_ ? bootUUID_ : uuidFromBootUuidBytes(bootUuid_, hasBootUuid());                 \
+  }                                                                                                 \
+  void setBootUUID(std::optional<Uuid> uuid) { bootUUID_ = uuid; }                                  \
+  std::optional<Uuid> lastBootUUID() const {                                                        \
     return lastBootUUID_ ? lastBootUUID_ : uuidFromBootUuidBytes(lastBootUuid_, hasLastBootUuid()); \
-  }                                                                                                  \
-  void setLastBootUUID(std::optional<Uuid> uuid) { lastBootUUID_ = uuid; }                           \
-                                                                                                     \
- private:                                                                                            \
-  std::optional<Uuid> bootUUID_;                                                                     \
+  }                                                                                                 \
+  void setLastBootUUID(std::optional<Uuid> uuid) { lastBootUUID_ = uuid; }                          \
+                                                                                                    \
+ private:                                                                                           \
+  std::optional<Uuid> bootUUID_;                                                                    \
   std::optional<Uuid> lastBootUUID_;

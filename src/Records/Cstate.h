@@ -5,8 +5,8 @@
 
 namespace bw {
 
-#define BW_CSTATE_FIELDS(F)                                 \
-  F(level, Level, 1, UInt64, Optional, "level")             \
+#define BW_CSTATE_FIELDS(F)                     \
+  F(level, Level, 1, UInt64, Optional, "level") \
   F(residency, Residency, 2, UInt64, Optional, "residency")
 
 class Cstate final : public Record {

@@ -8,8 +8,7 @@ namespace bw {
 BW_RECORD_DEFINE(Cstates, BW_CSTATES_FIELDS, BW_CSTATES_REPEATED)
 
 std::optional<std::string> Cstates::prettyPrint() const {
-  std::string text =
-      core() == -1 ? std::string("Package") : format("Core %lld", static_cast<long long>(core()));
+  std::string text = core() == -1 ? std::string("Package") : format("Core %lld", static_cast<long long>(core()));
   text += " C-state detail: ";
   for (const Cstate& state : states())
     text += format("C%llu %7llu   ", static_cast<unsigned long long>(state.level()),

@@ -12,8 +12,7 @@ namespace bw {
   F(isCore, IsCore, 2, Bool, Optional, "is_core")                     \
   F(core, Core, 3, SInt64, Optional, "core")
 
-#define BW_CSTATES_REPEATED(R)            \
-  R(states, States, 65, Cstate, "states")
+#define BW_CSTATES_REPEATED(R) R(states, States, 65, Cstate, "states")
 
 class Cstates final : public Record {
  public:

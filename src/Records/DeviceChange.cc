@@ -8,8 +8,8 @@ namespace bw {
 BW_RECORD_DEFINE(DeviceChange, BW_DEVICE_CHANGE_FIELDS, BW_NO_REPEATED_FIELDS)
 
 std::optional<std::string> DeviceChange::prettyPrint() const {
-  return format("DeviceChange\t%u\t ", static_cast<unsigned>(deviceType())) + deviceName() + " (@" +
-         deviceId() + ")\t" + (nowConnected() != 0 ? "" : "dis") + "connected";
+  return format("DeviceChange\t%u\t ", static_cast<unsigned>(deviceType())) + deviceName() + " (@" + deviceId() +
+         ")\t" + (nowConnected() != 0 ? "" : "dis") + "connected";
 }
 
 }  // namespace bw

@@ -5,12 +5,12 @@
 
 namespace bw {
 
-#define BW_DEVICE_CHANGE_FIELDS(F)                                            \
-  F(absoluteTime, AbsoluteTime, 1, UInt64, Required, "absoluteTime")          \
-  F(deviceType, DeviceType, 2, UInt32, Optional, "deviceType")                \
-  F(deviceName, DeviceName, 3, String, Optional, "deviceName")                \
-  F(deviceId, DeviceId, 4, String, Optional, "deviceId")                      \
-  F(nowConnected, NowConnected, 5, UInt32, Optional, "nowConnected")          \
+#define BW_DEVICE_CHANGE_FIELDS(F)                                   \
+  F(absoluteTime, AbsoluteTime, 1, UInt64, Required, "absoluteTime") \
+  F(deviceType, DeviceType, 2, UInt32, Optional, "deviceType")       \
+  F(deviceName, DeviceName, 3, String, Optional, "deviceName")       \
+  F(deviceId, DeviceId, 4, String, Optional, "deviceId")             \
+  F(nowConnected, NowConnected, 5, UInt32, Optional, "nowConnected") \
   F(registryEntryId, RegistryEntryId, 6, UInt64, Optional, "registryEntryId")
 
 class DeviceChange final : public Record {

@@ -6,11 +6,9 @@
 
 namespace bw {
 
-#define BW_INTERRUPTS_FIELDS(F)                                      \
-  F(absoluteTime, AbsoluteTime, 1, UInt64, Required, "absoluteTime")
+#define BW_INTERRUPTS_FIELDS(F) F(absoluteTime, AbsoluteTime, 1, UInt64, Required, "absoluteTime")
 
-#define BW_INTERRUPTS_REPEATED(R)                     \
-  R(vectors, Vectors, 64, InterruptVector, "vectors")
+#define BW_INTERRUPTS_REPEATED(R) R(vectors, Vectors, 64, InterruptVector, "vectors")
 
 class Interrupts final : public Record {
  public:

@@ -8,15 +8,15 @@
 
 namespace bw {
 
-#define BW_LOG_STARTS_V1_FIELDS(F)                                                  \
-  F(version, Version, 1, String, Required, "version")                               \
-  F(absoluteTime, AbsoluteTime, 2, UInt64, Required, "absoluteTime")                \
-  F(wallTime, WallTime, 3, UInt64, Required, "wallTime")                            \
-  F(writer, Writer, 4, UInt64, Optional, "writer")                                  \
-  F(bootUuid, BootUuid, 5, Bytes, Optional, "bootUuid")                             \
-  F(systemVersion, SystemVersion, 6, String, Optional, "systemVersion")             \
-  F(lastBootUuid, LastBootUuid, 7, Bytes, Optional, "lastBootUuid")                 \
-  F(isFirst, IsFirst, 8, UInt64, Optional, "isFirst")                               \
+#define BW_LOG_STARTS_V1_FIELDS(F)                                      \
+  F(version, Version, 1, String, Required, "version")                   \
+  F(absoluteTime, AbsoluteTime, 2, UInt64, Required, "absoluteTime")    \
+  F(wallTime, WallTime, 3, UInt64, Required, "wallTime")                \
+  F(writer, Writer, 4, UInt64, Optional, "writer")                      \
+  F(bootUuid, BootUuid, 5, Bytes, Optional, "bootUuid")                 \
+  F(systemVersion, SystemVersion, 6, String, Optional, "systemVersion") \
+  F(lastBootUuid, LastBootUuid, 7, Bytes, Optional, "lastBootUuid")     \
+  F(isFirst, IsFirst, 8, UInt64, Optional, "isFirst")                   \
   F(lastSystemVersion, LastSystemVersion, 9, String, Optional, "lastSystemVersion")
 
 class LogStartsV1 final : public Record {

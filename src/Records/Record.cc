@@ -10,10 +10,29 @@ namespace bw {
 
 const char* recordClassName(RecordClass c) {
   static const char* const kNames[] = {
-      "LogStartsV0", "LogStartsV1",  "BatteryChargeLevel", "PackageEnergyStatistics", "ProcessUsage",
-      "PowerStateChange", "SleepWake", "TimeChange", "DateChange", "UserIdle", "DeviceChange", "Interrupts",
-      "InterruptVector", "SystemMemory", "BluetoothPowerResidency", "SystemIO", "Cstates", "Cstate",
-      "DisplayBrightness", "FanState", "SmcKeys", "SmcKey", "PanelSelfRefresh",
+      "LogStartsV0",
+      "LogStartsV1",
+      "BatteryChargeLevel",
+      "PackageEnergyStatistics",
+      "ProcessUsage",
+      "PowerStateChange",
+      "SleepWake",
+      "TimeChange",
+      "DateChange",
+      "UserIdle",
+      "DeviceChange",
+      "Interrupts",
+      "InterruptVector",
+      "SystemMemory",
+      "BluetoothPowerResidency",
+      "SystemIO",
+      "Cstates",
+      "Cstate",
+      "DisplayBrightness",
+      "FanState",
+      "SmcKeys",
+      "SmcKey",
+      "PanelSelfRefresh",
   };
   return kNames[static_cast<int>(c)];
 }

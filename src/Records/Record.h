@@ -113,10 +113,12 @@ class Record {
 
 // The record as its class `T` when its tag says so, else null. Cheaper than
 // dynamic_cast; every record class has a `kClass` tag.
-template <class T> T* recordCast(Record* r) {
+template <class T>
+T* recordCast(Record* r) {
   return r != nullptr && r->recordClass() == T::kClass ? static_cast<T*>(r) : nullptr;
 }
-template <class T> const T* recordCast(const Record* r) {
+template <class T>
+const T* recordCast(const Record* r) {
   return r != nullptr && r->recordClass() == T::kClass ? static_cast<const T*>(r) : nullptr;
 }
 

@@ -121,36 +121,28 @@ struct VarintCodec {
 template <>
 struct Codec<FieldKind::UInt64> : VarintCodec<std::uint64_t, WFL::TYPE_UINT64> {
   static void write(int n, std::uint64_t v, CodedOutputStream& out) { WFL::WriteUInt64(n, v, &out); }
-  static std::size_t size(int n, std::uint64_t v) {
-    return WFL::TagSize(n, WFL::TYPE_UINT64) + WFL::UInt64Size(v);
-  }
+  static std::size_t size(int n, std::uint64_t v) { return WFL::TagSize(n, WFL::TYPE_UINT64) + WFL::UInt64Size(v); }
   static Value value(std::uint64_t v) { return Value(static_cast<unsigned long long>(v)); }
   static std::uint64_t from(const Value& v) { return v.uint64Value(); }
 };
 template <>
 struct Codec<FieldKind::SInt64> : VarintCodec<std::int64_t, WFL::TYPE_SINT64> {
   static void write(int n, std::int64_t v, CodedOutputStream& out) { WFL::WriteSInt64(n, v, &out); }
-  static std::size_t size(int n, std::int64_t v) {
-    return WFL::TagSize(n, WFL::TYPE_SINT64) + WFL::SInt64Size(v);
-  }
+  static std::size_t size(int n, std::int64_t v) { return WFL::TagSize(n, WFL::TYPE_SINT64) + WFL::SInt64Size(v); }
   static Value value(std::int64_t v) { return Value(static_cast<long long>(v)); }
   static std::int64_t from(const Value& v) { return v.int64Value(); }
 };
 template <>
 struct Codec<FieldKind::UInt32> : VarintCodec<std::uint32_t, WFL::TYPE_UINT32> {
   static void write(int n, std::uint32_t v, CodedOutputStream& out) { WFL::WriteUInt32(n, v, &out); }
-  static std::size_t size(int n, std::uint32_t v) {
-    return WFL::TagSize(n, WFL::TYPE_UINT32) + WFL::UInt32Size(v);
-  }
+  static std::size_t size(int n, std::uint32_t v) { return WFL::TagSize(n, WFL::TYPE_UINT32) + WFL::UInt32Size(v); }
   static Value value(std::uint32_t v) { return Value(static_cast<unsigned long long>(v)); }
   static std::uint32_t from(const Value& v) { return static_cast<std::uint32_t>(v.uint64Value()); }
 };
 template <>
 struct Codec<FieldKind::Int32> : VarintCodec<std::int32_t, WFL::TYPE_INT32> {
   static void write(int n, std::int32_t v, CodedOutputStream& out) { WFL::WriteInt32(n, v, &out); }
-  static std::size_t size(int n, std::int32_t v) {
-    return WFL::TagSize(n, WFL::TYPE_INT32) + WFL::Int32Size(v);
-  }
+  static std::size_t size(int n, std::int32_t v) { return WFL::TagSize(n, WFL::TYPE_INT32) + WFL::Int32Size(v); }
   static Value value(std::int32_t v) { return Value(static_cast<long long>(v)); }
   static std::int32_t from(const Value& v) { return static_cast<std::int32_t>(v.int64Value()); }
 };
@@ -164,9 +156,7 @@ struct Codec<FieldKind::Bool> : VarintCodec<bool, WFL::TYPE_BOOL> {
 template <>
 struct Codec<FieldKind::Double> {
   using Type = double;
-  static bool read(CodedInputStream& in, double* v) {
-    return WFL::ReadPrimitive<double, WFL::TYPE_DOUBLE>(&in, v);
-  }
+  static bool read(CodedInputStream& in, double* v) { return WFL::ReadPrimitive<double, WFL::TYPE_DOUBLE>(&in, v); }
   static void write(int n, double v, CodedOutputStream& out) { WFL::WriteDouble(n, v, &out); }
   static std::size_t size(int n, double) { return WFL::TagSize(n, WFL::TYPE_DOUBLE) + WFL::kDoubleSize; }
   static Value value(double v) { return Value(v); }
@@ -193,9 +183,7 @@ struct Codec<FieldKind::Bytes> {
   using Type = std::string;
   static bool read(CodedInputStream& in, std::string* v) { return readLengthDelimited(in, v); }
   static void write(int n, const std::string& v, CodedOutputStream& out) { WFL::WriteBytes(n, v, &out); }
-  static std::size_t size(int n, const std::string& v) {
-    return WFL::TagSize(n, WFL::TYPE_BYTES) + WFL::BytesSize(v);
-  }
+  static std::size_t size(int n, const std::string& v) { return WFL::TagSize(n, WFL::TYPE_BYTES) + WFL::BytesSize(v); }
   static Value value(const std::string& v) { return Value(Data(v.begin(), v.end())); }
   static std::string from(const Value& v) { return stringFromValue(v); }
   static std::uint64_t hash(const std::string& v) { return hashBytes(v); }
@@ -238,15 +226,13 @@ void writeElements(int n, const std::vector<E>& elements, CodedOutputStream& out
 template <class E>
 std::size_t elementsSize(int n, const std::vector<E>& elements) {
   std::size_t total = 0;
-  for (const E& e : elements)
-    total += WFL::TagSize(n, WFL::TYPE_MESSAGE) + WFL::LengthDelimitedSize(e.byteSize());
+  for (const E& e : elements) total += WFL::TagSize(n, WFL::TYPE_MESSAGE) + WFL::LengthDelimitedSize(e.byteSize());
   return total;
 }
 
 template <class E>
 bool elementsEqual(const std::vector<E>& a, const std::vector<E>& b) {
-  return std::equal(a.begin(), a.end(), b.begin(), b.end(),
-                    [](const E& x, const E& y) { return x.isEqual(y); });
+  return std::equal(a.begin(), a.end(), b.begin(), b.end(), [](const E& x, const E& y) { return x.isEqual(y); });
 }
 
 // Order-sensitive combination of the elements' hashes; 0 for no elements.
@@ -282,8 +268,7 @@ constexpr bool strictlyAscending(const FieldInfo (&fields)[n]) {
 #define BW_CODEC_OF(kind) ::bw::record_codec::Codec<BW_CODEC_KIND(kind)>
 #define BW_CODEC_ALWAYS(kind, presence) \
   ::bw::record_codec::alwaysPresent(BW_CODEC_KIND(kind), ::bw::record_codec::Presence::presence)
-#define BW_CODEC_PRESENT(self, name, kind, presence) \
-  (BW_CODEC_ALWAYS(kind, presence) || (self).hasBit(kBit_##name))
+#define BW_CODEC_PRESENT(self, name, kind, presence) (BW_CODEC_ALWAYS(kind, presence) || (self).hasBit(kBit_##name))
 
 #define BW_CODEC_READ_CASE(name, Name, number, kind, presence, key) \
   case number:                                                      \
@@ -298,11 +283,10 @@ constexpr bool strictlyAscending(const FieldInfo (&fields)[n]) {
 // Records stay in memory for the whole run: no spare element capacity.
 #define BW_CODEC_SHRINK_REPEATED(name, Name, number, Element, key) name##_.shrink_to_fit();
 
-#define BW_CODEC_WRITE(name, Name, number, kind, presence, key)                                     \
-  if constexpr (BW_CODEC_REQUIRED(presence) && ::bw::record_codec::isObject(BW_CODEC_KIND(kind))) { \
-    if (!hasBit(kBit_##name))                                                                       \
-      ::bw::record_codec::requiredFieldMissing("nil != self->_" #name, kAssertionSource);           \
-  }                                                                                                 \
+#define BW_CODEC_WRITE(name, Name, number, kind, presence, key)                                                   \
+  if constexpr (BW_CODEC_REQUIRED(presence) && ::bw::record_codec::isObject(BW_CODEC_KIND(kind))) {               \
+    if (!hasBit(kBit_##name)) ::bw::record_codec::requiredFieldMissing("nil != self->_" #name, kAssertionSource); \
+  }                                                                                                               \
   if (BW_CODEC_PRESENT(*this, name, kind, presence)) BW_CODEC_OF(kind)::write(number, name##_, output);
 #define BW_CODEC_WRITE_REPEATED(name, Name, number, Element, key) \
   ::bw::record_codec::writeElements(number, name##_, output);
@@ -323,8 +307,7 @@ constexpr bool strictlyAscending(const FieldInfo (&fields)[n]) {
 
 #define BW_CODEC_HASH(name, Name, number, kind, presence, key) \
   if (BW_CODEC_PRESENT(*this, name, kind, presence)) h ^= BW_CODEC_OF(kind)::hash(name##_);
-#define BW_CODEC_HASH_REPEATED(name, Name, number, Element, key) \
-  h ^= ::bw::record_codec::elementsHash(name##_);
+#define BW_CODEC_HASH_REPEATED(name, Name, number, Element, key) h ^= ::bw::record_codec::elementsHash(name##_);
 
 #define BW_CODEC_COPY_TO(name, Name, number, kind, presence, key) \
   if (BW_CODEC_ALWAYS(kind, presence)) {                          \
@@ -337,22 +320,21 @@ constexpr bool strictlyAscending(const FieldInfo (&fields)[n]) {
 #define BW_CODEC_COPY_TO_REPEATED(name, Name, number, Element, key) \
   if (!name##_.empty() && &t != this) t.name##_ = name##_;
 
-#define BW_CODEC_FIELD_INFO(name, Name, number, kind, presence, key)                      \
-  ::bw::FieldInfo{#name,                                                                  \
-                  number,                                                                 \
-                  BW_CODEC_KIND(kind),                                                    \
-                  BW_CODEC_REQUIRED(presence),                                            \
-                  key,                                                                    \
-                  kClass,                                                                 \
-                  [](const ::bw::Record& r) -> ::bw::Value {                              \
-                    const auto& s = static_cast<const Self&>(r);                          \
-                    if (!BW_CODEC_PRESENT(s, name, kind, presence)) return ::bw::Value(); \
-                    return BW_CODEC_OF(kind)::value(s.name##_);                           \
-                  },                                                                      \
-                  [](::bw::Record& r, const ::bw::Value& v) {                             \
-                    static_cast<Self&>(r).set##Name(BW_CODEC_OF(kind)::from(v));          \
-                  },                                                                      \
-                  nullptr},
+#define BW_CODEC_FIELD_INFO(name, Name, number, kind, presence, key)                                              \
+  ::bw::FieldInfo{                                                                                                \
+      #name,                                                                                                      \
+      number,                                                                                                     \
+      BW_CODEC_KIND(kind),                                                                                        \
+      BW_CODEC_REQUIRED(presence),                                                                                \
+      key,                                                                                                        \
+      kClass,                                                                                                     \
+      [](const ::bw::Record& r) -> ::bw::Value {                                                                  \
+        const auto& s = static_cast<const Self&>(r);                                                              \
+        if (!BW_CODEC_PRESENT(s, name, kind, presence)) return ::bw::Value();                                     \
+        return BW_CODEC_OF(kind)::value(s.name##_);                                                               \
+      },                                                                                                          \
+      [](::bw::Record& r, const ::bw::Value& v) { static_cast<Self&>(r).set##Name(BW_CODEC_OF(kind)::from(v)); }, \
+      nullptr},
 #define BW_CODEC_REPEATED_INFO(name, Name, number, Element, key)                                   \
   ::bw::FieldInfo{#name,                                                                           \
                   number,                                                                          \
@@ -371,68 +353,66 @@ constexpr bool strictlyAscending(const FieldInfo (&fields)[n]) {
 
 // Defines every generic operation of `Class` (declared by
 // BW_RECORD_INTERFACE) from its field lists.
-#define BW_RECORD_DEFINE(Class, FIELDS, REPEATED)                                                  \
-  bool Class::readFrom(google::protobuf::io::CodedInputStream& input) {                            \
-    for (;;) {                                                                                     \
-      std::uint64_t key = ::bw::record_codec::WFL::WIRETYPE_END_GROUP;                             \
-      if (!::bw::record_codec::atEnd(input) && !::bw::record_codec::readVarint(input, &key))       \
-        return false;                                                                              \
-      if ((key & 7) == ::bw::record_codec::WFL::WIRETYPE_END_GROUP) {                              \
-        REPEATED(BW_CODEC_SHRINK_REPEATED)                                                         \
-        return true;                                                                               \
-      }                                                                                            \
-      switch (key >> 3) {                                                                          \
-        FIELDS(BW_CODEC_READ_CASE)                                                                 \
-        REPEATED(BW_CODEC_READ_REPEATED_CASE)                                                      \
-        default:                                                                                   \
-          if (!::bw::record_codec::skipField(input, key)) return false;                            \
-      }                                                                                            \
-    }                                                                                              \
-  }                                                                                                \
-  void Class::writeTo(google::protobuf::io::CodedOutputStream& output) const {                     \
-    [[maybe_unused]] static constexpr const char* kAssertionSource = "Records/" #Class;            \
-    FIELDS(BW_CODEC_WRITE)                                                                         \
-    REPEATED(BW_CODEC_WRITE_REPEATED)                                                              \
-  }                                                                                                \
-  std::size_t Class::byteSize() const {                                                            \
-    std::size_t total = 0;                                                                         \
-    FIELDS(BW_CODEC_SIZE)                                                                          \
-    REPEATED(BW_CODEC_SIZE_REPEATED)                                                               \
-    return total;                                                                                  \
-  }                                                                                                \
-  ::bw::Dictionary Class::dictionaryRepresentation() const {                                       \
-    ::bw::Dictionary d;                                                                            \
-    for (const ::bw::FieldInfo& f : schema().fields) {                                             \
-      ::bw::Value v = f.get(*this);                                                                \
-      if (!v.isNull()) d.emplace(f.key, std::move(v));                                             \
-    }                                                                                              \
-    return d;                                                                                      \
-  }                                                                                                \
-  std::unique_ptr<::bw::Record> Class::copy() const { return std::make_unique<Class>(*this); }     \
-  void Class::copyTo(::bw::Record& target) const {                                                 \
-    if (target.recordClass() != kClass) ::bw::record_codec::copyTargetMismatch(*this, target);     \
-    Class& t = static_cast<Class&>(target);                                                        \
-    FIELDS(BW_CODEC_COPY_TO)                                                                       \
-    REPEATED(BW_CODEC_COPY_TO_REPEATED)                                                            \
-  }                                                                                                \
-  bool Class::isEqual(const ::bw::Record& other) const {                                           \
-    if (other.recordClass() != kClass) return false;                                               \
-    const Class& o = static_cast<const Class&>(other);                                             \
-    FIELDS(BW_CODEC_EQUAL)                                                                         \
-    REPEATED(BW_CODEC_EQUAL_REPEATED)                                                              \
-    return true;                                                                                   \
-  }                                                                                                \
-  std::uint64_t Class::hash() const {                                                              \
-    std::uint64_t h = 0;                                                                           \
-    FIELDS(BW_CODEC_HASH)                                                                          \
-    REPEATED(BW_CODEC_HASH_REPEATED)                                                               \
-    return h;                                                                                      \
-  }                                                                                                \
-  const ::bw::RecordSchema& Class::schema() {                                                      \
-    using Self = Class;                                                                            \
-    static constexpr ::bw::FieldInfo kFields[] = {FIELDS(BW_CODEC_FIELD_INFO)                      \
-                                                      REPEATED(BW_CODEC_REPEATED_INFO)};           \
-    static_assert(::bw::record_codec::strictlyAscending(kFields), "fields must ascend by number"); \
-    static const ::bw::RecordSchema kSchema{kClass, #Class, kFields};                              \
-    return kSchema;                                                                                \
+#define BW_RECORD_DEFINE(Class, FIELDS, REPEATED)                                                                \
+  bool Class::readFrom(google::protobuf::io::CodedInputStream& input) {                                          \
+    for (;;) {                                                                                                   \
+      std::uint64_t key = ::bw::record_codec::WFL::WIRETYPE_END_GROUP;                                           \
+      if (!::bw::record_codec::atEnd(input) && !::bw::record_codec::readVarint(input, &key)) return false;       \
+      if ((key & 7) == ::bw::record_codec::WFL::WIRETYPE_END_GROUP) {                                            \
+        REPEATED(BW_CODEC_SHRINK_REPEATED)                                                                       \
+        return true;                                                                                             \
+      }                                                                                                          \
+      switch (key >> 3) {                                                                                        \
+        FIELDS(BW_CODEC_READ_CASE)                                                                               \
+        REPEATED(BW_CODEC_READ_REPEATED_CASE)                                                                    \
+        default:                                                                                                 \
+          if (!::bw::record_codec::skipField(input, key)) return false;                                          \
+      }                                                                                                          \
+    }                                                                                                            \
+  }                                                                                                              \
+  void Class::writeTo(google::protobuf::io::CodedOutputStream& output) const {                                   \
+    [[maybe_unused]] static constexpr const char* kAssertionSource = "Records/" #Class;                          \
+    FIELDS(BW_CODEC_WRITE)                                                                                       \
+    REPEATED(BW_CODEC_WRITE_REPEATED)                                                                            \
+  }                                                                                                              \
+  std::size_t Class::byteSize() const {                                                                          \
+    std::size_t total = 0;                                                                                       \
+    FIELDS(BW_CODEC_SIZE)                                                                                        \
+    REPEATED(BW_CODEC_SIZE_REPEATED)                                                                             \
+    return total;                                                                                                \
+  }                                                                                                              \
+  ::bw::Dictionary Class::dictionaryRepresentation() const {                                                     \
+    ::bw::Dictionary d;                                                                                          \
+    for (const ::bw::FieldInfo& f : schema().fields) {                                                           \
+      ::bw::Value v = f.get(*this);                                                                              \
+      if (!v.isNull()) d.emplace(f.key, std::move(v));                                                           \
+    }                                                                                                            \
+    return d;                                                                                                    \
+  }                                                                                                              \
+  std::unique_ptr<::bw::Record> Class::copy() const { return std::make_unique<Class>(*this); }                   \
+  void Class::copyTo(::bw::Record& target) const {                                                               \
+    if (target.recordClass() != kClass) ::bw::record_codec::copyTargetMismatch(*this, target);                   \
+    Class& t = static_cast<Class&>(target);                                                                      \
+    FIELDS(BW_CODEC_COPY_TO)                                                                                     \
+    REPEATED(BW_CODEC_COPY_TO_REPEATED)                                                                          \
+  }                                                                                                              \
+  bool Class::isEqual(const ::bw::Record& other) const {                                                         \
+    if (other.recordClass() != kClass) return false;                                                             \
+    const Class& o = static_cast<const Class&>(other);                                                           \
+    FIELDS(BW_CODEC_EQUAL)                                                                                       \
+    REPEATED(BW_CODEC_EQUAL_REPEATED)                                                                            \
+    return true;                                                                                                 \
+  }                                                                                                              \
+  std::uint64_t Class::hash() const {                                                                            \
+    std::uint64_t h = 0;                                                                                         \
+    FIELDS(BW_CODEC_HASH)                                                                                        \
+    REPEATED(BW_CODEC_HASH_REPEATED)                                                                             \
+    return h;                                                                                                    \
+  }                                                                                                              \
+  const ::bw::RecordSchema& Class::schema() {                                                                    \
+    using Self = Class;                                                                                          \
+    static constexpr ::bw::FieldInfo kFields[] = {FIELDS(BW_CODEC_FIELD_INFO) REPEATED(BW_CODEC_REPEATED_INFO)}; \
+    static_assert(::bw::record_codec::strictlyAscending(kFields), "fields must ascend by number");               \
+    static const ::bw::RecordSchema kSchema{kClass, #Class, kFields};                                            \
+    return kSchema;                                                                                              \
   }

@@ -6,23 +6,22 @@
 
 namespace bw {
 
-#define BW_SLEEP_WAKE_FIELDS(F)                                                                 \
-  F(absoluteTime, AbsoluteTime, 1, UInt64, Required, "absolute_time")                           \
-  F(wallTime, WallTime, 2, UInt64, Required, "wall_time")                                       \
-  F(reason, Reason, 3, UInt32, Optional, "reason")                                              \
-  F(wakeFromStandby, WakeFromStandby, 4, Bool, Optional, "wake_from_standby")                   \
-  F(wakeType, WakeType, 5, String, Optional, "wake_type")                                       \
-  F(efiMsec, EfiMsec, 6, UInt64, Optional, "efi_msec")                                          \
-  F(booterMsec, BooterMsec, 7, UInt64, Optional, "booter_msec")                                 \
-  F(trampolineMsec, TrampolineMsec, 8, UInt64, Optional, "trampoline_msec")                     \
-  F(imageReadMsec, ImageReadMsec, 9, UInt64, Optional, "image_read_msec")                       \
-  F(imagePages, ImagePages, 10, UInt64, Optional, "image_pages")                                \
-  F(image1Pages, Image1Pages, 11, UInt64, Optional, "image1_pages")                             \
-  F(wakeNotificationMsec, WakeNotificationMsec, 12, UInt64, Optional, "wake_notification_msec") \
-  F(lockScreenReadyMsec, LockScreenReadyMsec, 13, UInt64, Optional, "lock_screen_ready_msec")   \
-  F(graphicsReadyMsec, GraphicsReadyMsec, 14, UInt64, Optional, "graphics_ready_msec")          \
-  F(recordWriteAbsoluteTime, RecordWriteAbsoluteTime, 15, UInt64, Optional,                     \
-    "record_write_absolute_time")                                                               \
+#define BW_SLEEP_WAKE_FIELDS(F)                                                                           \
+  F(absoluteTime, AbsoluteTime, 1, UInt64, Required, "absolute_time")                                     \
+  F(wallTime, WallTime, 2, UInt64, Required, "wall_time")                                                 \
+  F(reason, Reason, 3, UInt32, Optional, "reason")                                                        \
+  F(wakeFromStandby, WakeFromStandby, 4, Bool, Optional, "wake_from_standby")                             \
+  F(wakeType, WakeType, 5, String, Optional, "wake_type")                                                 \
+  F(efiMsec, EfiMsec, 6, UInt64, Optional, "efi_msec")                                                    \
+  F(booterMsec, BooterMsec, 7, UInt64, Optional, "booter_msec")                                           \
+  F(trampolineMsec, TrampolineMsec, 8, UInt64, Optional, "trampoline_msec")                               \
+  F(imageReadMsec, ImageReadMsec, 9, UInt64, Optional, "image_read_msec")                                 \
+  F(imagePages, ImagePages, 10, UInt64, Optional, "image_pages")                                          \
+  F(image1Pages, Image1Pages, 11, UInt64, Optional, "image1_pages")                                       \
+  F(wakeNotificationMsec, WakeNotificationMsec, 12, UInt64, Optional, "wake_notification_msec")           \
+  F(lockScreenReadyMsec, LockScreenReadyMsec, 13, UInt64, Optional, "lock_screen_ready_msec")             \
+  F(graphicsReadyMsec, GraphicsReadyMsec, 14, UInt64, Optional, "graphics_ready_msec")                    \
+  F(recordWriteAbsoluteTime, RecordWriteAbsoluteTime, 15, UInt64, Optional, "record_write_absolute_time") \
   F(xcpmDeepIdleStats, XcpmDeepIdleStats, 16, String, Optional, "xcpm_deep_idle_stats")
 
 class SleepWake final : public Record {

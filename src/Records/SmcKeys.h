@@ -6,11 +6,9 @@
 
 namespace bw {
 
-#define BW_SMC_KEYS_FIELDS(F)                                         \
-  F(absoluteTime, AbsoluteTime, 1, UInt64, Required, "absolute_time")
+#define BW_SMC_KEYS_FIELDS(F) F(absoluteTime, AbsoluteTime, 1, UInt64, Required, "absolute_time")
 
-#define BW_SMC_KEYS_REPEATED(R)         \
-  R(keys, Keys, 66, SmcKey, "keys")
+#define BW_SMC_KEYS_REPEATED(R) R(keys, Keys, 66, SmcKey, "keys")
 
 class SmcKeys final : public Record {
  public:

@@ -17,10 +17,10 @@ namespace {
 constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
 
 [[noreturn]] void throwBeyondBounds(std::uint64_t index, std::uint64_t count) {
-  std::string reason =
-      count == 0 ? format("index %llu beyond bounds for empty list", static_cast<unsigned long long>(index))
-                 : format("index %llu beyond bounds [0 .. %llu]", static_cast<unsigned long long>(index),
-                          static_cast<unsigned long long>(count - 1));
+  std::string reason = count == 0
+                           ? format("index %llu beyond bounds for empty list", static_cast<unsigned long long>(index))
+                           : format("index %llu beyond bounds [0 .. %llu]", static_cast<unsigned long long>(index),
+                                    static_cast<unsigned long long>(count - 1));
   throw Exception(kRangeException, reason, {{"index", index}, {"count", count}});
 }
 
@@ -66,8 +66,7 @@ Range DataSet::indexRangeForRange(Range range) const {
   return Range{location, static_cast<std::uint64_t>(length)};
 }
 
-void DataSet::enumerateValuesInRange(Range range,
-                                     const std::function<void(std::uint64_t, double)>& visitor) const {
+void DataSet::enumerateValuesInRange(Range range, const std::function<void(std::uint64_t, double)>& visitor) const {
   Range indexes = indexRangeForRange(range);
   if (indexes.location == kNotFound) return;
   for (std::uint64_t i = indexes.location; i < indexes.end(); ++i) visitor(positions_[i], values_[i]);
@@ -145,8 +144,7 @@ double DataSet::valueAtPosition(std::uint64_t position) const {
 //   6. not holding: none;
 //   7. holding: the last sample when the position lies after it (approach
 //      <= 0), the first when it lies before it (approach >= 0), else none.
-int DataSet::dataPoints(DataPoint points[2], std::uint64_t position, std::int32_t approach,
-                        bool hold) const {
+int DataSet::dataPoints(DataPoint points[2], std::uint64_t position, std::int32_t approach, bool hold) const {
   const std::size_t n = positions_.size();
   const std::size_t i = indexForPosition(position);
   const auto take = [&](int slot, std::size_t index) { points[slot] = DataPoint{positions_[index], values_[index]}; };

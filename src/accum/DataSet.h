@@ -48,8 +48,7 @@ class DataSet {
 
   // Calls `visitor(position, value)` for each sample of `indexRangeForRange`,
   // in ascending order.
-  void enumerateValuesInRange(Range range,
-                              const std::function<void(std::uint64_t, double)>& visitor) const;
+  void enumerateValuesInRange(Range range, const std::function<void(std::uint64_t, double)>& visitor) const;
   std::vector<double> valuesInRange(Range range) const;
 
   // Statistics over the samples in the range; NaN when there is none.
@@ -77,8 +76,7 @@ class DataSet {
   // writes them in ascending order into `points` and answers how many.
   // `approach` < 0 looks before the position, > 0 after, 0 around it;
   // `hold` lets a position outside the samples take the edge sample.
-  int dataPoints(DataPoint points[2], std::uint64_t position, std::int32_t approach,
-                 bool hold) const;
+  int dataPoints(DataPoint points[2], std::uint64_t position, std::int32_t approach, bool hold) const;
 
   // First stored position; throws kRangeException on an empty set.
   std::uint64_t minPosition() const;

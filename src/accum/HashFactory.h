@@ -35,14 +35,13 @@ namespace hash_factory_detail {
 inline std::string describeKey(const Uuid& key) { return key.string(); }
 inline std::string describeKey(const std::string& key) { return describeValue(Value(key)); }
 template <class K>
-  requires std::is_arithmetic_v<K>
-std::string describeKey(K key) {
-  return describeNumber(Value(key));
-}
+requires std::is_arithmetic_v<K> std::string describeKey(K key) { return describeNumber(Value(key)); }
 
 template <class V>
 std::string describeObject(const V& value) {
-  if constexpr (requires { { value.description() } -> std::convertible_to<std::string>; }) {
+  if constexpr (requires {
+                  { value.description() } -> std::convertible_to<std::string>;
+                }) {
     return value.description();
   } else if constexpr (requires { V::kClassName; }) {
     return format("<%s: %p>", V::kClassName, static_cast<const void*>(&value));
@@ -63,7 +62,7 @@ class HashFactory {
   // New values are plain instances of `Class` (Value itself or a subclass),
   // which names itself through a static `kClassName`.
   template <class Class = Value>
-    requires std::derived_from<Class, Value> && std::default_initializable<Class>
+  requires std::derived_from<Class, Value> && std::default_initializable<Class>
   static HashFactory withClass() {
     HashFactory factory;
     factory.factoryClass_ = Class::kClassName;

@@ -20,8 +20,7 @@ double Interpolator::valueAtPosition(std::uint64_t position) const {
   return interpolateValueAtPosition(position, 0, true);
 }
 
-double Interpolator::interpolateValueAtPosition(std::uint64_t position, std::int32_t approach,
-                                                bool hold) const {
+double Interpolator::interpolateValueAtPosition(std::uint64_t position, std::int32_t approach, bool hold) const {
   DataPoint points[2];
   switch (dataSet_.dataPoints(points, position, approach, hold)) {
     case 0:

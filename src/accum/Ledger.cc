@@ -21,13 +21,11 @@ void Ledger::addTo(List list, std::uint64_t position) {
 }
 
 std::uint64_t Ledger::creditsAtPosition(std::uint64_t position) const {
-  return static_cast<std::uint64_t>(std::upper_bound(credits_.begin(), credits_.end(), position) -
-                                    credits_.begin());
+  return static_cast<std::uint64_t>(std::upper_bound(credits_.begin(), credits_.end(), position) - credits_.begin());
 }
 
 std::uint64_t Ledger::debitsAtPosition(std::uint64_t position) const {
-  return static_cast<std::uint64_t>(std::upper_bound(debits_.begin(), debits_.end(), position) -
-                                    debits_.begin());
+  return static_cast<std::uint64_t>(std::upper_bound(debits_.begin(), debits_.end(), position) - debits_.begin());
 }
 
 std::uint64_t Ledger::valueAtPosition(std::uint64_t position) const {

@@ -60,8 +60,7 @@ void LedgerSweep::append(std::uint64_t position, bool isCredit) {
 bool LedgerSweep::extend(std::span<const std::uint64_t> credits, std::span<const std::uint64_t> debits) {
   if (level_.size() > 1) {
     if (!credits.empty() && credits.front() < lastPosition_) return false;
-    if (!debits.empty() && (debits.front() < lastPosition_ ||
-                            (debits.front() == lastPosition_ && lastWasCredit_)))
+    if (!debits.empty() && (debits.front() < lastPosition_ || (debits.front() == lastPosition_ && lastWasCredit_)))
       return false;
   }
   std::size_t c = 0, d = 0;
@@ -115,8 +114,8 @@ std::uint64_t LedgerSweep::timeAboveZero(const std::vector<std::uint64_t>& credi
   return total;
 }
 
-std::uint64_t LedgerSweep::walk(const std::vector<std::uint64_t>& credits,
-                                const std::vector<std::uint64_t>& debits, Range range) {
+std::uint64_t LedgerSweep::walk(const std::vector<std::uint64_t>& credits, const std::vector<std::uint64_t>& debits,
+                                Range range) {
   constexpr std::uint64_t kInfinity = std::numeric_limits<std::uint64_t>::max();
   const std::uint64_t begin = range.location;
   const std::uint64_t end = range.location + range.length;

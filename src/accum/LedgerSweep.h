@@ -30,12 +30,12 @@ class LedgerSweep {
 
   // The time above zero within `range` for the lists this index was built
   // from. `range` must not wrap (location + length >= location).
-  std::uint64_t timeAboveZero(const std::vector<std::uint64_t>& credits,
-                              const std::vector<std::uint64_t>& debits, Range range) const;
+  std::uint64_t timeAboveZero(const std::vector<std::uint64_t>& credits, const std::vector<std::uint64_t>& debits,
+                              Range range) const;
 
   // The same answer by walking every event, for a range whose end wraps.
-  static std::uint64_t walk(const std::vector<std::uint64_t>& credits,
-                            const std::vector<std::uint64_t>& debits, Range range);
+  static std::uint64_t walk(const std::vector<std::uint64_t>& credits, const std::vector<std::uint64_t>& debits,
+                            Range range);
 
  private:
   void append(std::uint64_t position, bool isCredit);
@@ -45,11 +45,11 @@ class LedgerSweep {
   std::uint64_t lastPosition_ = 0;
   bool lastWasCredit_ = false;
   // Entry i describes the state after the first i events.
-  std::vector<std::int64_t> level_;         // credits minus debits
-  std::vector<std::uint64_t> closedTime_;   // sum of closed intervals' lengths (mod 2^64)
-  std::vector<std::uint64_t> lastOpen_;     // position of the last 0 -> 1 credit, 0 if none
-  std::vector<std::int64_t> lastCredit_;    // index of the last credit event, -1 if none
-  std::vector<std::int64_t> lastClose_;     // index of the last 1 -> 0 debit, -1 if none
+  std::vector<std::int64_t> level_;        // credits minus debits
+  std::vector<std::uint64_t> closedTime_;  // sum of closed intervals' lengths (mod 2^64)
+  std::vector<std::uint64_t> lastOpen_;    // position of the last 0 -> 1 credit, 0 if none
+  std::vector<std::int64_t> lastCredit_;   // index of the last credit event, -1 if none
+  std::vector<std::int64_t> lastClose_;    // index of the last 1 -> 0 debit, -1 if none
 };
 
 }  // namespace bw

@@ -26,9 +26,7 @@ void SawtoothInterpolator::addValue(double value, std::uint64_t position) {
 }
 
 void SawtoothInterpolator::checkOrderAround(std::size_t index) {
-  const auto before = [this](std::size_t j) {
-    return segments_[j].maxPosition() <= segments_[j + 1].minPosition();
-  };
+  const auto before = [this](std::size_t j) { return segments_[j].maxPosition() <= segments_[j + 1].minPosition(); };
   if (index > 0 && !before(index - 1)) ordered_ = false;
   if (index + 1 < segments_.size() && !before(index)) ordered_ = false;
 }
@@ -50,10 +48,9 @@ const IncreasingInterpolator* SawtoothInterpolator::current() const {
 
 void SawtoothInterpolator::setCurrent(std::size_t index) {
   if (index >= segments_.size()) {
-    throw Exception(kRangeException,
-                    format("index %zu beyond bounds of %zu segments", index, segments_.size()),
-                    {{"index", static_cast<std::uint64_t>(index)},
-                     {"count", static_cast<std::uint64_t>(segments_.size())}});
+    throw Exception(
+        kRangeException, format("index %zu beyond bounds of %zu segments", index, segments_.size()),
+        {{"index", static_cast<std::uint64_t>(index)}, {"count", static_cast<std::uint64_t>(segments_.size())}});
   }
   current_ = index;
 }
@@ -112,8 +109,8 @@ double SawtoothInterpolator::averageSlopeFrom(std::uint64_t from, std::uint64_t 
   if (!ordered_) return walkSlope(from, to);
   const auto firstWalked = std::partition_point(
       segments_.begin(), segments_.end(), [from](const IncreasingInterpolator& s) { return from > s.maxPosition(); });
-  const auto firstAfter = std::partition_point(
-      segments_.begin(), segments_.end(), [to](const IncreasingInterpolator& s) { return s.minPosition() <= to; });
+  const auto firstAfter = std::partition_point(segments_.begin(), segments_.end(),
+                                               [to](const IncreasingInterpolator& s) { return s.minPosition() <= to; });
   const auto j1 = static_cast<std::size_t>(firstWalked - segments_.begin());
   const auto j2 = std::max(j1, static_cast<std::size_t>(firstAfter - segments_.begin()));
   if (j1 == j2) return std::numeric_limits<double>::quiet_NaN();  // nothing covered: 0 / 0

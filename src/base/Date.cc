@@ -16,8 +16,8 @@ std::string describeDate(Date d) {
   static std::mutex lock;
   std::call_once(once, [] {
     UErrorCode status = U_ZERO_ERROR;
-    format = std::make_unique<icu::SimpleDateFormat>(
-        icu::UnicodeString("yyyy-MM-dd HH:mm:ss Z"), icu::Locale::getRoot(), status);
+    format = std::make_unique<icu::SimpleDateFormat>(icu::UnicodeString("yyyy-MM-dd HH:mm:ss Z"),
+                                                     icu::Locale::getRoot(), status);
     format->adoptTimeZone(icu::TimeZone::createTimeZone("UTC"));
   });
   std::lock_guard<std::mutex> guard(lock);

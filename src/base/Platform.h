@@ -2,10 +2,10 @@
 // Everything that reads or touches the running machine goes through this
 // interface, so that tests can replace the clock, the boot identity, the
 // user, the store directories and the system log.
+#include <sys/types.h>
 #include <cstdint>
 #include <optional>
 #include <string>
-#include <sys/types.h>
 
 #include "base/Uuid.h"
 

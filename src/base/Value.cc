@@ -6,9 +6,7 @@
 
 namespace bw {
 
-bool Value::isNumber() const {
-  return is<bool>() || is<std::int64_t>() || is<std::uint64_t>() || is<double>();
-}
+bool Value::isNumber() const { return is<bool>() || is<std::int64_t>() || is<std::uint64_t>() || is<double>(); }
 
 double Value::doubleValue() const {
   if (auto* b = getIf<bool>()) return *b ? 1 : 0;
@@ -55,8 +53,8 @@ namespace {
 bool needsQuotes(const std::string& s) {
   if (s.empty()) return true;
   for (unsigned char c : s) {
-    bool plain = (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') || (c >= '0' && c <= '9') ||
-                 c == '_' || c == '$' || c == '.' || c == '/' || c == ':' || c == '-';
+    bool plain = (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') || (c >= '0' && c <= '9') || c == '_' || c == '$' ||
+                 c == '.' || c == '/' || c == ':' || c == '-';
     if (!plain) return true;
   }
   return false;
@@ -70,12 +68,23 @@ void appendString(std::string& out, const std::string& s) {
   out.push_back('"');
   for (char c : s) {
     switch (c) {
-      case '"': out += "\\\""; break;
-      case '\\': out += "\\\\"; break;
-      case '\n': out += "\\n"; break;
-      case '\t': out += "\\t"; break;
-      case '\r': out += "\\r"; break;
-      default: out.push_back(c);
+      case '"':
+        out += "\\\"";
+        break;
+      case '\\':
+        out += "\\\\";
+        break;
+      case '\n':
+        out += "\\n";
+        break;
+      case '\t':
+        out += "\\t";
+        break;
+      case '\r':
+        out += "\\r";
+        break;
+      default:
+        out.push_back(c);
     }
   }
   out.push_back('"');

@@ -20,8 +20,8 @@ using Dictionary = std::map<std::string, Value>;
 
 class Value {
  public:
-  using Storage = std::variant<std::monostate, bool, std::int64_t, std::uint64_t, double, std::string,
-                               Data, Date, Array, Dictionary>;
+  using Storage = std::variant<std::monostate, bool, std::int64_t, std::uint64_t, double, std::string, Data, Date,
+                               Array, Dictionary>;
 
   Value() = default;
   Value(bool v) : v_(v) {}
@@ -41,11 +41,26 @@ class Value {
 
   bool isNull() const { return std::holds_alternative<std::monostate>(v_); }
   bool isNumber() const;
-  template <class T> bool is() const { return std::holds_alternative<T>(v_); }
-  template <class T> const T& get() const { return std::get<T>(v_); }
-  template <class T> T& get() { return std::get<T>(v_); }
-  template <class T> const T* getIf() const { return std::get_if<T>(&v_); }
-  template <class T> T* getIf() { return std::get_if<T>(&v_); }
+  template <class T>
+  bool is() const {
+    return std::holds_alternative<T>(v_);
+  }
+  template <class T>
+  const T& get() const {
+    return std::get<T>(v_);
+  }
+  template <class T>
+  T& get() {
+    return std::get<T>(v_);
+  }
+  template <class T>
+  const T* getIf() const {
+    return std::get_if<T>(&v_);
+  }
+  template <class T>
+  T* getIf() {
+    return std::get_if<T>(&v_);
+  }
 
   // Numeric reads with the usual conversions; 0 for anything not a number.
   double doubleValue() const;

@@ -62,9 +62,7 @@ const option kLongOptions[] = {
 
 const char kShortOptions[] = "aDf:d:s:e:A:L0JB:b:R:pPS:I";
 
-std::uint64_t nowMilliseconds() {
-  return static_cast<std::uint64_t>(platform().nowMicroseconds() / 1000);
-}
+std::uint64_t nowMilliseconds() { return static_cast<std::uint64_t>(platform().nowMicroseconds() / 1000); }
 
 // strtoul over exactly `len` characters starting at `s`; false unless the
 // field is all digits (no sign, no blanks: "2024-1-1" would otherwise read
@@ -123,8 +121,7 @@ std::vector<std::string> splitAt(const std::string& s, char sep) {
 
 bool parseDayArgument(const char* arg, Options& options) {
   std::uint32_t year, month, day;
-  if (std::strcmp(arg, "today") == 0 || std::strcmp(arg, "current") == 0 ||
-      std::strcmp(arg, "yesterday") == 0) {
+  if (std::strcmp(arg, "today") == 0 || std::strcmp(arg, "current") == 0 || std::strcmp(arg, "yesterday") == 0) {
     time_t seconds = static_cast<time_t>(platform().nowMicroseconds() / 1000000);
     tm local{};
     localtime_r(&seconds, &local);
@@ -219,9 +216,15 @@ Options parseOptions(int argc, char** argv) {
   int c;
   while ((c = getopt_long(argc, args.data(), kShortOptions, kLongOptions, nullptr)) != -1) {
     switch (c) {
-      case 'a': options.setShow_all(true); break;
-      case 'D': options.setMode(kModeDump); break;
-      case 'f': options.setFrom_path(std::string(optarg)); break;
+      case 'a':
+        options.setShow_all(true);
+        break;
+      case 'D':
+        options.setMode(kModeDump);
+        break;
+      case 'f':
+        options.setFrom_path(std::string(optarg));
+        break;
       case 'd':
         if (!parseDayArgument(optarg, options)) usage(64);
         break;
@@ -236,15 +239,27 @@ Options parseOptions(int argc, char** argv) {
       case 'A':
         if (!parseAgoArgument(optarg, options)) usage(64);
         break;
-      case 'L': options.setMode(kModeListFiles); break;
-      case '0': options.setListfileswithnull(true); break;
-      case kOptDebug: gDebug = 1; break;
+      case 'L':
+        options.setMode(kModeListFiles);
+        break;
+      case '0':
+        options.setListfileswithnull(true);
+        break;
+      case kOptDebug:
+        gDebug = 1;
+        break;
       case 'R':
         if (!parseDebugRangeArgument(optarg, options)) usage(64);
         break;
-      case kOptShowEvents: options.setMode(kModeShowEvents); break;
-      case kOptDashboard: options.setMode(kModeDashboard); break;
-      case kOptShowBattery: options.setMode(kModeShowBattery); break;
+      case kOptShowEvents:
+        options.setMode(kModeShowEvents);
+        break;
+      case kOptDashboard:
+        options.setMode(kModeDashboard);
+        break;
+      case kOptShowBattery:
+        options.setMode(kModeShowBattery);
+        break;
       case kOptDaily:
         launchdTest();
         options.setMode(kModeDaily);
@@ -253,10 +268,15 @@ Options parseOptions(int argc, char** argv) {
         launchdTest();
         options.setMode(kModeService);
         break;
-      case kOptXpcDebug: options.setMode(kModeServiceDebug); break;
-      case 'J': options.setIncludingSubjobs(true); break;
+      case kOptXpcDebug:
+        options.setMode(kModeServiceDebug);
+        break;
+      case 'J':
+        options.setIncludingSubjobs(true);
+        break;
       case 'p':
-      case 'P': exitWithError(64, format("The -%c option is no longer supported", c));
+      case 'P':
+        exitWithError(64, format("The -%c option is no longer supported", c));
       case 'b':
         if (options.only_boot_uuid()) usage(64);
         if (strcasecmp(optarg, "current") == 0) {
@@ -275,10 +295,16 @@ Options parseOptions(int argc, char** argv) {
           options.setOnly_boot_uuid(uuid);
         }
         break;
-      case kOptHelp: usage(0);
-      case 'S': options.setDomain_mask_states(splitAt(optarg, ',')); break;
-      case 'I': options.setExclude_post_install(true); break;
-      default: usage(64);
+      case kOptHelp:
+        usage(0);
+      case 'S':
+        options.setDomain_mask_states(splitAt(optarg, ','));
+        break;
+      case 'I':
+        options.setExclude_post_install(true);
+        break;
+      default:
+        usage(64);
     }
   }
 

@@ -65,15 +65,15 @@ void plotModel(const Model& model) {
   const Timeline& timeline = model.timeline();
   std::uint64_t first = std::numeric_limits<std::uint64_t>::max();
   std::uint64_t last = 0;
-  timeline.enumerateEventsUsingBlock([&](const Record& event, std::uint64_t position, std::uint64_t,
-                                         const AbsTime&, bool&) {
-    first = std::min(first, position);
-    last = std::max(last, position);
-    if (event.recordClass() == RecordClass::BatteryChargeLevel) {
-      const auto& level = static_cast<const BatteryChargeLevel&>(event);
-      plotLine(o, position, static_cast<double>(level.charge()) * 100 / static_cast<double>(level.maxCharge()));
-    }
-  });
+  timeline.enumerateEventsUsingBlock(
+      [&](const Record& event, std::uint64_t position, std::uint64_t, const AbsTime&, bool&) {
+        first = std::min(first, position);
+        last = std::max(last, position);
+        if (event.recordClass() == RecordClass::BatteryChargeLevel) {
+          const auto& level = static_cast<const BatteryChargeLevel&>(event);
+          plotLine(o, position, static_cast<double>(level.charge()) * 100 / static_cast<double>(level.maxCharge()));
+        }
+      });
 
   o << '\n';
   const auto* battery = dynamic_cast<const BatterySummarizer*>(model.summarizer("Power"));
@@ -85,28 +85,34 @@ void plotModel(const Model& model) {
   }
 
   o << '\n';
-  timeline.enumerateEventsUsingBlock([&](const Record& event, std::uint64_t position, std::uint64_t,
-                                         const AbsTime&, bool&) {
-    if (event.recordClass() != RecordClass::SleepWake) return;
-    switch (static_cast<const SleepWake&>(event).reason()) {
-      case 0: plotLine(o, position, 100); break;
-      case 2: plotLine(o, position, 50); break;
-      case 1: plotLine(o, position, 0); break;
-      default:
-        // Any other reason means the plot's assumptions are wrong: stop hard.
-        o.flush();
-        std::fprintf(stderr, "brindlewick: unexpected sleep/wake reason %u\n",
-                     static_cast<const SleepWake&>(event).reason());
-        std::abort();
-    }
-  });
+  timeline.enumerateEventsUsingBlock(
+      [&](const Record& event, std::uint64_t position, std::uint64_t, const AbsTime&, bool&) {
+        if (event.recordClass() != RecordClass::SleepWake) return;
+        switch (static_cast<const SleepWake&>(event).reason()) {
+          case 0:
+            plotLine(o, position, 100);
+            break;
+          case 2:
+            plotLine(o, position, 50);
+            break;
+          case 1:
+            plotLine(o, position, 0);
+            break;
+          default:
+            // Any other reason means the plot's assumptions are wrong: stop hard.
+            o.flush();
+            std::fprintf(stderr, "brindlewick: unexpected sleep/wake reason %u\n",
+                         static_cast<const SleepWake&>(event).reason());
+            std::abort();
+        }
+      });
 
   o << '\n';
-  timeline.enumerateEventsUsingBlock([&](const Record& event, std::uint64_t position, std::uint64_t,
-                                         const AbsTime&, bool&) {
-    if (event.recordClass() != RecordClass::PowerStateChange) return;
-    plotLine(o, position, static_cast<const PowerStateChange&>(event).change() != 0 ? 0 : 100);
-  });
+  timeline.enumerateEventsUsingBlock(
+      [&](const Record& event, std::uint64_t position, std::uint64_t, const AbsTime&, bool&) {
+        if (event.recordClass() != RecordClass::PowerStateChange) return;
+        plotLine(o, position, static_cast<const PowerStateChange&>(event).change() != 0 ? 0 : 100);
+      });
 }
 
 }  // namespace

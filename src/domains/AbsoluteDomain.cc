@@ -7,8 +7,7 @@ namespace bw {
 AbsoluteDomain::AbsoluteDomain(const AbsRange& range) : range_(range) {
   if (gDebug) {
     err() << format("Selecting events from %llu to %llu in %s", static_cast<unsigned long long>(range.location()),
-                    static_cast<unsigned long long>(range.location() + range.length()),
-                    range.boot().string().c_str())
+                    static_cast<unsigned long long>(range.location() + range.length()), range.boot().string().c_str())
           << '\n';
   }
 }

@@ -12,8 +12,7 @@ class AbsoluteDomain : public Domain {
   // standard error.
   explicit AbsoluteDomain(const AbsRange& range);
 
-  void addEvent(const Record& event, std::uint64_t position, const AbsTime& absTime,
-                std::uint64_t wallTime) override;
+  void addEvent(const Record& event, std::uint64_t position, const AbsTime& absTime, std::uint64_t wallTime) override;
 
   const AbsRange& range() const { return range_; }
 

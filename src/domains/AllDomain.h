@@ -9,8 +9,7 @@ class AllDomain : public Domain {
  public:
   AllDomain();
 
-  void addEvent(const Record& event, std::uint64_t position, const AbsTime& absTime,
-                std::uint64_t wallTime) override;
+  void addEvent(const Record& event, std::uint64_t position, const AbsTime& absTime, std::uint64_t wallTime) override;
   // Closes the one range at `position`.
   void setLastPosition(std::uint64_t position) override;
 };

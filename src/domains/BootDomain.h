@@ -13,8 +13,7 @@ class BootDomain : public Domain {
  public:
   explicit BootDomain(std::optional<Uuid> uuid);
 
-  void addEvent(const Record& event, std::uint64_t position, const AbsTime& absTime,
-                std::uint64_t wallTime) override;
+  void addEvent(const Record& event, std::uint64_t position, const AbsTime& absTime, std::uint64_t wallTime) override;
 
   const std::optional<Uuid>& uuid() const { return uuid_; }
 

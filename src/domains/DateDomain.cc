@@ -21,10 +21,9 @@ std::uint64_t millisecondsFromUDate(UDate date) {
 // The first instant of the day in the named zone.
 std::uint64_t firstInstantOfDay(const YearMonthDay& day, std::string_view zoneName) {
   UErrorCode status = U_ZERO_ERROR;
-  icu::GregorianCalendar calendar(
-      icu::TimeZone::createTimeZone(icu::UnicodeString::fromUTF8(icu::StringPiece(zoneName.data(),
-                                                                                   static_cast<std::int32_t>(zoneName.size())))),
-      status);
+  icu::GregorianCalendar calendar(icu::TimeZone::createTimeZone(icu::UnicodeString::fromUTF8(
+                                      icu::StringPiece(zoneName.data(), static_cast<std::int32_t>(zoneName.size())))),
+                                  status);
   calendar.clear();
   calendar.set(UCAL_EXTENDED_YEAR, day.year);
   calendar.set(UCAL_MONTH, day.month - 1);
@@ -62,8 +61,7 @@ DateDomain::DateDomain(const YearMonthDay& components) : WallTimeDomain(Quiet{},
   }
 }
 
-void DateDomain::addEvent(const Record& event, std::uint64_t position, const AbsTime& absTime,
-                          std::uint64_t wallTime) {
+void DateDomain::addEvent(const Record& event, std::uint64_t position, const AbsTime& absTime, std::uint64_t wallTime) {
   if (event.recordClass() == RecordClass::TimeChange) {
     applyTimeChange(static_cast<const TimeChange&>(event));
     tzSet_ = true;

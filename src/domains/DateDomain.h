@@ -23,8 +23,7 @@ class DateDomain : public WallTimeDomain {
   // error. The bounds stay 0 until a zone is known.
   explicit DateDomain(const YearMonthDay& components);
 
-  void addEvent(const Record& event, std::uint64_t position, const AbsTime& absTime,
-                std::uint64_t wallTime) override;
+  void addEvent(const Record& event, std::uint64_t position, const AbsTime& absTime, std::uint64_t wallTime) override;
 
   YearMonthDay components() const { return components_; }
   // The zone in force, by its full name; none until a known abbreviation.

@@ -21,8 +21,7 @@ class Domain : public Summarizer {
   static std::unique_ptr<Domain> domainWithOptions(const Options& options);
 
   // Abstract here: every subclass has its own rule. Terminates.
-  void addEvent(const Record& event, std::uint64_t position, const AbsTime& absTime,
-                std::uint64_t wallTime) override;
+  void addEvent(const Record& event, std::uint64_t position, const AbsTime& absTime, std::uint64_t wallTime) override;
 
   // Reports whether the record at `position` is inside: a change opens or
   // closes a range there; no change does nothing.

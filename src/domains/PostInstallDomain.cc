@@ -26,8 +26,7 @@ void PostInstallDomain::addEvent(const Record& event, std::uint64_t position, co
     }
     return;
   }
-  const bool inside =
-      absTime.boot == startAbsTime_->boot && absTime.time <= startAbsTime_->time + kPostInstallSpan;
+  const bool inside = absTime.boot == startAbsTime_->boot && absTime.time <= startAbsTime_->time + kPostInstallSpan;
   setDomain(inside, position);
 }
 

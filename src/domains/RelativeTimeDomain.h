@@ -13,8 +13,7 @@ class RelativeTimeDomain : public Domain {
   // error.
   RelativeTimeDomain(std::uint64_t start, std::uint64_t end);
 
-  void addEvent(const Record& event, std::uint64_t position, const AbsTime& absTime,
-                std::uint64_t wallTime) override;
+  void addEvent(const Record& event, std::uint64_t position, const AbsTime& absTime, std::uint64_t wallTime) override;
 
   std::uint64_t start() const { return start_; }
   void setStart(std::uint64_t v) { start_ = v; }

@@ -19,8 +19,7 @@ class WallTimeDomain : public RelativeTimeDomain {
   // (SECONDS)" on standard error, dates as formatWallTime prints them.
   WallTimeDomain(std::uint64_t start, std::uint64_t end);
 
-  void addEvent(const Record& event, std::uint64_t position, const AbsTime& absTime,
-                std::uint64_t wallTime) override;
+  void addEvent(const Record& event, std::uint64_t position, const AbsTime& absTime, std::uint64_t wallTime) override;
 
   // The position of the previous record this rule saw (0 before any).
   std::uint64_t lastTime() const { return lastTime_; }

@@ -81,14 +81,13 @@ std::string formatWallTime(std::uint64_t ms) {
     text = formatWithIcu(ms, withOffset);
   } else {
     char buf[48];
-    int n = std::snprintf(buf, sizeof buf, "%04lld-%02u-%02u %02lld:%02lld:%02lld", static_cast<long long>(year),
-                          month, day, static_cast<long long>(secondOfDay / 3600),
+    int n = std::snprintf(buf, sizeof buf, "%04lld-%02u-%02u %02lld:%02lld:%02lld", static_cast<long long>(year), month,
+                          day, static_cast<long long>(secondOfDay / 3600),
                           static_cast<long long>(secondOfDay / 60 % 60), static_cast<long long>(secondOfDay % 60));
     if (withOffset) {
       const std::int64_t minutes = (offsetSeconds < 0 ? -offsetSeconds : offsetSeconds) / 60;
-      std::snprintf(buf + n, sizeof buf - static_cast<std::size_t>(n), " %c%02lld%02lld",
-                    offsetSeconds < 0 ? '-' : '+', static_cast<long long>(minutes / 60),
-                    static_cast<long long>(minutes % 60));
+      std::snprintf(buf + n, sizeof buf - static_cast<std::size_t>(n), " %c%02lld%02lld", offsetSeconds < 0 ? '-' : '+',
+                    static_cast<long long>(minutes / 60), static_cast<long long>(minutes % 60));
     }
     text = buf;
   }

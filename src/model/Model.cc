@@ -125,9 +125,8 @@ std::vector<std::unique_ptr<Summary>> Model::summarizeTop(const std::string& key
 }
 
 std::vector<std::unique_ptr<Summary>> Model::sortedPowerSummariesInRanges(const std::vector<Range>& ranges) const {
-  return summarizeTop("Power", ranges, [](const Summary& s) {
-    return static_cast<const PowerSummary&>(s).avgPowerDenom() > 0.0;
-  });
+  return summarizeTop("Power", ranges,
+                      [](const Summary& s) { return static_cast<const PowerSummary&>(s).avgPowerDenom() > 0.0; });
 }
 
 std::uint64_t Model::wallTimeForRelative(std::uint64_t position) const {
@@ -149,8 +148,9 @@ std::vector<AbsRange> Model::absoluteTimeRangesForRelativeRanges(const std::vect
 std::string describeRanges(const std::optional<std::vector<Range>>& ranges) {
   if (!ranges) return "(null)";
   Array items;
-  for (const Range& r : *ranges) items.push_back(Value(format("{%llu, %llu}", static_cast<unsigned long long>(r.location),
-                                                              static_cast<unsigned long long>(r.length))));
+  for (const Range& r : *ranges)
+    items.push_back(Value(format("{%llu, %llu}", static_cast<unsigned long long>(r.location),
+                                 static_cast<unsigned long long>(r.length))));
   return describeValue(Value(items));
 }
 

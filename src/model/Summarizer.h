@@ -43,8 +43,7 @@ class Summarizer {
 
   // Feeds one record: boot-change handling, end at sleep, acceptance by
   // class, then the handler's answer.
-  virtual void addEvent(const Record& event, std::uint64_t position, const AbsTime& absTime,
-                        std::uint64_t wallTime);
+  virtual void addEvent(const Record& event, std::uint64_t position, const AbsTime& absTime, std::uint64_t wallTime);
   // Opens a range at `position` unless one is open.
   void beginRangeAtPosition(std::uint64_t position);
   // Records the open range up to `position`; an empty or backwards range is

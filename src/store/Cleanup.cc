@@ -12,9 +12,7 @@ namespace bw {
 
 namespace {
 
-bool startsWith(const std::string& s, const std::string& prefix) {
-  return s.compare(0, prefix.size(), prefix) == 0;
-}
+bool startsWith(const std::string& s, const std::string& prefix) { return s.compare(0, prefix.size(), prefix) == 0; }
 
 std::string withSlash(std::string directory) {
   if (directory.empty() || directory.back() != '/') directory.push_back('/');

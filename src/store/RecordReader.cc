@@ -116,8 +116,8 @@ FileRecords readStatsFile(const std::string& path, const Options& options, Recor
   return readStatsData(file.data(), file.size(), path, options, pool);
 }
 
-FileRecords readStatsData(const std::uint8_t* data, std::size_t size, const std::string& path,
-                          const Options& options, RecordPool& pool) {
+FileRecords readStatsData(const std::uint8_t* data, std::size_t size, const std::string& path, const Options& options,
+                          RecordPool& pool) {
   FileRecords result;
   const RecordPool::Mark fileStart = pool.mark();
   auto drop = [&](const std::string& why) {
@@ -187,8 +187,7 @@ FileRecords readStatsData(const std::uint8_t* data, std::size_t size, const std:
       pool.rewind(*afterFirst);
       result.records.resize(1);
       result.damaged = true;
-      platform().systemLog(" ** All data from boot " + bootOf(result.records.front()).string() +
-                           " will be dropped.");
+      platform().systemLog(" ** All data from boot " + bootOf(result.records.front()).string() + " will be dropped.");
     } else {
       // Nothing was collected yet: the file is dropped without marking a boot.
       pool.rewind(fileStart);

@@ -47,8 +47,8 @@ FileRecords readStatsFile(const std::string& path, const Options& options, Recor
 
 // The same over a file's bytes already in memory; `name` stands for the path
 // in the messages. The records do not point into `data`.
-FileRecords readStatsData(const std::uint8_t* data, std::size_t size, const std::string& name,
-                          const Options& options, RecordPool& pool);
+FileRecords readStatsData(const std::uint8_t* data, std::size_t size, const std::string& name, const Options& options,
+                          RecordPool& pool);
 
 // Reads the given files, in the given order, and groups them by boot.
 RecordsByBoot readStatsFiles(const std::vector<std::string>& paths, const Options& options);

@@ -62,8 +62,7 @@ std::optional<Date> modificationDate(const std::string& path) {
   return Date{static_cast<double>(st.st_mtim.tv_sec) + static_cast<double>(st.st_mtim.tv_nsec) / 1e9};
 }
 
-void scanDirectory(FileList& files, const std::string& directory, bool recursive,
-                   const std::optional<Date>& cutoff) {
+void scanDirectory(FileList& files, const std::string& directory, bool recursive, const std::optional<Date>& cutoff) {
   std::vector<std::string> names = recursive ? listTree(directory) : listNames(directory);
   Date newerThan = cutoff.value_or(Date::distantPast());
   if (gDebug) {

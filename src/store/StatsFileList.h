@@ -25,8 +25,7 @@ FileList statsFileList(const Options& options);
 // Adds the matching files of `directory` to `files`. Recursive scans match
 // each entry's path relative to `directory` (files and directories alike); a
 // directory that cannot be listed adds nothing.
-void scanDirectory(FileList& files, const std::string& directory, bool recursive,
-                   const std::optional<Date>& cutoff);
+void scanDirectory(FileList& files, const std::string& directory, bool recursive, const std::optional<Date>& cutoff);
 
 // The file's modification date, or none when its attributes cannot be read.
 std::optional<Date> modificationDate(const std::string& path);

@@ -118,8 +118,8 @@ void BatterySummarizer::summarizePositions(PowerSummary& summary, const Range& r
     weight = static_cast<double>(sec);
   }
   if (gDebug) {
-    err() << format("Power [%lu.%lu]: Ah = %.03g, V = %.03g, h = %.03g : mW = %ld\n", s, range.length, ah, volts,
-                    hours, truncatedPower(power));
+    err() << format("Power [%lu.%lu]: Ah = %.03g, V = %.03g, h = %.03g : mW = %ld\n", s, range.length, ah, volts, hours,
+                    truncatedPower(power));
   }
 
   summary.setAvgPowerNumer(summary.avgPowerNumer() + weight * power);
@@ -145,9 +145,7 @@ double BatterySummarizer::maxChargeAtPosition(std::uint64_t position) const {
   return std::round(maxCharge_.valueAtPosition(position));
 }
 
-double BatterySummarizer::voltageAtPosition(std::uint64_t position) const {
-  return voltage_.valueAtPosition(position);
-}
+double BatterySummarizer::voltageAtPosition(std::uint64_t position) const { return voltage_.valueAtPosition(position); }
 
 double BatterySummarizer::percentChargeAtPosition(std::uint64_t position) const {
   const double percent = chargeAtPosition(position) * 100 / maxChargeAtPosition(position);

@@ -29,8 +29,7 @@ class BatterySummarizer : public Summarizer {
 
   // Takes BatteryChargeLevel, PowerStateChange, SleepWake and LogStartsV1
   // records, by position.
-  void addEvent(const Record& event, std::uint64_t position, const AbsTime& absTime,
-                std::uint64_t wallTime) override;
+  void addEvent(const Record& event, std::uint64_t position, const AbsTime& absTime, std::uint64_t wallTime) override;
   std::unique_ptr<Summary> newSummary() const override { return std::make_unique<PowerSummary>(); }
   // By average power, descending, equal within the double epsilon.
   SummaryComparator comparator() const override { return &compareAveragePower; }

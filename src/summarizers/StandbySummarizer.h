@@ -67,8 +67,7 @@ class StandbySummarizer : public Summarizer {
   // Only SleepWake records count: sleep opens, a wake from standby closes
   // and counts (under "__ALL__" and under its non-empty wake type), any
   // other wake drops the open range.
-  void addEvent(const Record& event, std::uint64_t position, const AbsTime& absTime,
-                std::uint64_t wallTime) override;
+  void addEvent(const Record& event, std::uint64_t position, const AbsTime& absTime, std::uint64_t wallTime) override;
   // A StandbySummary with the swap disk's details.
   std::unique_ptr<Summary> newSummary() const override;
   // Works on positions: adds the range's length to the duration and the

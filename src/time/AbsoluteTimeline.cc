@@ -93,8 +93,7 @@ std::uint64_t AbsoluteTimeline::wallTimeForRelative(std::uint64_t position, std:
   return startWallTime() + (position - offset);
 }
 
-std::optional<AbsTime> AbsoluteTimeline::absoluteTimeForRelative(std::uint64_t position,
-                                                                 std::uint64_t offset) const {
+std::optional<AbsTime> AbsoluteTimeline::absoluteTimeForRelative(std::uint64_t position, std::uint64_t offset) const {
   if (position <= offset || position - offset > duration()) return std::nullopt;
   return AbsTime{bootUuid_, startAbsoluteTime_ + (position - offset)};
 }

@@ -50,9 +50,7 @@ const AbsoluteTimeline& BootTimeline::segment(std::size_t index) const {
   return static_cast<const AbsoluteTimeline&>(*objects().at(index));
 }
 
-std::uint64_t BootTimeline::startWallTime() const {
-  return objects().empty() ? 0 : objects().front()->startWallTime();
-}
+std::uint64_t BootTimeline::startWallTime() const { return objects().empty() ? 0 : objects().front()->startWallTime(); }
 
 std::uint64_t BootTimeline::endWallTime() const { return objects().empty() ? 0 : objects().back()->endWallTime(); }
 

@@ -6,7 +6,6 @@
 
 #include "base/Date.h"
 
-
 namespace bw {
 
 struct YearMonthDay {

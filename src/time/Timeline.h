@@ -81,9 +81,7 @@ class Timeline {
   // else extrapolated from the start of the child before the gap it lies
   // in; 0 past the end.
   virtual std::uint64_t wallTimeForRelative(std::uint64_t position, std::uint64_t offset) const;
-  virtual std::uint64_t wallTimeForRelative(std::uint64_t position) const {
-    return wallTimeForRelative(position, 0);
-  }
+  virtual std::uint64_t wallTimeForRelative(std::uint64_t position) const { return wallTimeForRelative(position, 0); }
   // The AbsTime at `position`; none in a gap, past the end, and at the
   // first instant of a segment that no earlier segment touches.
   virtual std::optional<AbsTime> absoluteTimeForRelative(std::uint64_t position, std::uint64_t offset) const;

@@ -83,41 +83,75 @@ TEST(RecordCodec, WireFormsAreWrittenAndReadAsExpected) {
   const std::string element = W().varint(1, 3).groupEnd(7).varint(2, 99).str();
   const std::string key = W().bytes(1, "TB0T").str();
   const WireCase cases[] = {
-      {"negative sint64 uses zigzag", C::BatteryChargeLevel,
+      {"negative sint64 uses zigzag",
+       C::BatteryChargeLevel,
        {{"charge", -5}, {"maxCharge", 5000}, {"cycleCount", 0}, {"instantAmperage", -1500}},
        std::string("\x10\x09\x18\x90\x4e\x20\x00\x28\xb7\x17", 10)},
-      {"negative int32 is a ten-byte varint", C::FanState, {{"absolute_time", 1}, {"loudness", -2}},
+      {"negative int32 is a ten-byte varint",
+       C::FanState,
+       {{"absolute_time", 1}, {"loudness", -2}},
        "\x08\x01\x10\xfe\xff\xff\xff\xff\xff\xff\xff\xff\x01"},
       {"required scalars are written unset", C::UserIdle, {}, std::string("\x08\x00\x10\x00", 4)},
       {"an absent optional field is not", C::BatteryChargeLevel, {}, std::string("\x10\x00\x18\x00\x20\x00", 6)},
-      {"a present optional zero is", C::SystemIO, {{"absoluteTime", 3}, {"diskReadOps", 0}},
+      {"a present optional zero is",
+       C::SystemIO,
+       {{"absoluteTime", 3}, {"diskReadOps", 0}},
        W().varint(1, 3).varint(2, 0).str()},
       {"Interrupts without vectors writes only field 1", C::Interrupts, {{"absoluteTime", 1234}}, "\x08\xd2\x09"},
-      {"repeated elements are length-delimited in order", C::Interrupts,
+      {"repeated elements are length-delimited in order",
+       C::Interrupts,
        {{"absoluteTime", 1},
         {"vectors", Array{Dictionary{{"cpuNumber", 0}, {"interruptCount", 10}}, Dictionary{{"vectorName", "hpet"}}}}},
        W().varint(1, 1).bytes(64, W().varint(1, 0).varint(2, 10).str()).bytes(64, W().bytes(3, "hpet").str()).str()},
-      {"DisplayBrightness skips a field 2", C::DisplayBrightness, {{"absoluteTime", 77}, {"brightness", 40}},
-       W().varint(1, 77).varint(3, 40).str(), W().varint(1, 77).varint(2, 5).varint(3, 40).str()},
-      {"unknown fields of every wire type and field 0 are skipped", C::SystemIO,
-       {{"absoluteTime", 9}, {"diskReadOps", 5}}, W().varint(1, 9).varint(2, 5).str(),
-       W().varint(1, 9).varint(40, 123456789).fixed64(41, 42).bytes(42, "ignored").fixed32(44, 7)
-           .groupStart(43).varint(1, 1).bytes(2, "nested").groupEnd(43)
-           .key(0).raw("\x05").key(2).raw("\x02xy").key(3).varint(1, 1).key(4)  // field 0, each wire type
-           .key(std::uint64_t{1} << 35).raw("\x01")                             // a key wider than 32 bits
-           .varint(2, 5).str()},
-      {"an end-group key stops the record", C::UserIdle, {{"absoluteTime", 5}}, W().varint(1, 5).varint(2, 0).str(),
+      {"DisplayBrightness skips a field 2",
+       C::DisplayBrightness,
+       {{"absoluteTime", 77}, {"brightness", 40}},
+       W().varint(1, 77).varint(3, 40).str(),
+       W().varint(1, 77).varint(2, 5).varint(3, 40).str()},
+      {"unknown fields of every wire type and field 0 are skipped",
+       C::SystemIO,
+       {{"absoluteTime", 9}, {"diskReadOps", 5}},
+       W().varint(1, 9).varint(2, 5).str(),
+       W().varint(1, 9)
+           .varint(40, 123456789)
+           .fixed64(41, 42)
+           .bytes(42, "ignored")
+           .fixed32(44, 7)
+           .groupStart(43)
+           .varint(1, 1)
+           .bytes(2, "nested")
+           .groupEnd(43)
+           .key(0)
+           .raw("\x05")
+           .key(2)
+           .raw("\x02xy")
+           .key(3)
+           .varint(1, 1)
+           .key(4)  // field 0, each wire type
+           .key(std::uint64_t{1} << 35)
+           .raw("\x01")  // a key wider than 32 bits
+           .varint(2, 5)
+           .str()},
+      {"an end-group key stops the record",
+       C::UserIdle,
+       {{"absoluteTime", 5}},
+       W().varint(1, 5).varint(2, 0).str(),
        W().varint(1, 5).groupEnd(9).varint(2, 7).str()},
-      {"an element that ends early has its rest skipped", C::Cstates,
+      {"an element that ends early has its rest skipped",
+       C::Cstates,
        {{"absolute_time", 1}, {"core", 4}, {"states", Array{Dictionary{{"level", 3}}}}},
        W().varint(1, 1).sint(3, 4).bytes(65, W().varint(1, 3).str()).str(),
        W().varint(1, 1).bytes(65, element).sint(3, 4).str()},
-      {"a known field is read as its declared type whatever the wire type", C::UserIdle,
-       {{"absoluteTime", 1}, {"change", 5}}, W().varint(1, 1).varint(2, 5).str(),
+      {"a known field is read as its declared type whatever the wire type",
+       C::UserIdle,
+       {{"absoluteTime", 1}, {"change", 5}},
+       W().varint(1, 1).varint(2, 5).str(),
        W().varint(1, 1).key(2 << 3 | 1).raw("\x05").str()},
-      {"repeated fields append across occurrences", C::SmcKeys,
+      {"repeated fields append across occurrences",
+       C::SmcKeys,
        {{"absolute_time", 3}, {"keys", Array{Dictionary{{"key", "TB0T"}}, Dictionary{{"key", "TB0T"}}}}},
-       W().varint(1, 3).bytes(66, key).bytes(66, key).str(), W().bytes(66, key).varint(1, 3).bytes(66, key).str()}};
+       W().varint(1, 3).bytes(66, key).bytes(66, key).str(),
+       W().bytes(66, key).varint(1, 3).bytes(66, key).str()}};
   for (const WireCase& c : cases) {
     SCOPED_TRACE(c.name);
     std::unique_ptr<Record> record = test::build(c.recordClass, c.fields);
@@ -195,8 +229,11 @@ TEST(RecordEquality, ComparesPresenceValuesAndElementsInOrder) {
       {"a required string counts as absent until set", C::LogStartsV1, {}, {{"version", ""}}, false},
       {"elements in another order", C::Cstates, levels({1, 2}), levels({2, 1}), false},
       {"fewer elements", C::Cstates, levels({1, 2}), levels({1}), false},
-      {"an element with one more field", C::Cstates, levels({1}),
-       {{"states", Array{Dictionary{{"level", 1}, {"residency", 0}}}}}, false},
+      {"an element with one more field",
+       C::Cstates,
+       levels({1}),
+       {{"states", Array{Dictionary{{"level", 1}, {"residency", 0}}}}},
+       false},
   };
   for (const EqualityCase& c : cases) {
     SCOPED_TRACE(c.what);
@@ -235,10 +272,15 @@ TEST(RecordHash, IsTheXorOfOneTermPerPresentField) {
   for (const auto& [c, fields, expected] : integers) EXPECT_EQ(build(c, fields)->hash(), expected);
   // A double's term: its rounded magnitude times the multiplier plus its fraction scaled by 2^64.
   constexpr std::uint64_t kQuarter = std::uint64_t{1} << 62;
-  const std::pair<double, std::uint64_t> doubles[] = {
-      {0.0, 0}, {2.0, 2 * kC}, {2.25, 2 * kC + kQuarter}, {-2.25, 2 * kC + kQuarter}, {2.75, 3 * kC - kQuarter},
-      {0.5, kC - (std::uint64_t{1} << 63)}, {18446744073709551616.0 + 4096.0, 4096 * kC},  // modulo 2^64
-      {INFINITY, 0}, {NAN, 0}};
+  const std::pair<double, std::uint64_t> doubles[] = {{0.0, 0},
+                                                      {2.0, 2 * kC},
+                                                      {2.25, 2 * kC + kQuarter},
+                                                      {-2.25, 2 * kC + kQuarter},
+                                                      {2.75, 3 * kC - kQuarter},
+                                                      {0.5, kC - (std::uint64_t{1} << 63)},
+                                                      {18446744073709551616.0 + 4096.0, 4096 * kC},  // modulo 2^64
+                                                      {INFINITY, 0},
+                                                      {NAN, 0}};
   const std::uint64_t keyOnly = build(C::SmcKey, {{"key", "K"}})->hash();
   for (auto [d, term] : doubles)
     EXPECT_EQ(build(C::SmcKey, {{"key", "K"}, {"dvalue", d}})->hash() ^ keyOnly, term) << d;
@@ -252,11 +294,17 @@ struct CopyCase {
 
 TEST(RecordCopyTo, CopiesRequiredScalarsAndPresentFieldsAndKeepsTheTargetsOthers) {
   const CopyCase cases[] = {
-      {"absent optional fields keep the target's", C::SystemIO, {{"absoluteTime", 1}, {"diskReadOps", 2}},
-       {{"diskReadOps", 7}, {"diskWriteOps", 9}}, {{"absoluteTime", 1}, {"diskReadOps", 2}, {"diskWriteOps", 9}}},
+      {"absent optional fields keep the target's",
+       C::SystemIO,
+       {{"absoluteTime", 1}, {"diskReadOps", 2}},
+       {{"diskReadOps", 7}, {"diskWriteOps", 9}},
+       {{"absoluteTime", 1}, {"diskReadOps", 2}, {"diskWriteOps", 9}}},
       {"required scalars are always copied", C::UserIdle, {}, {{"absoluteTime", 5}, {"change", 1}}, {}},
-      {"an absent required string keeps the target's", C::LogStartsV1, {{"wallTime", 3}},
-       {{"version", "1.0"}}, {{"version", "1.0"}, {"wallTime", 3}}},
+      {"an absent required string keeps the target's",
+       C::LogStartsV1,
+       {{"wallTime", 3}},
+       {{"version", "1.0"}},
+       {{"version", "1.0"}, {"wallTime", 3}}},
       {"no elements keep the target's", C::Cstates, {}, levels({4}), levels({4})},
       {"elements replace the target's", C::Cstates, levels({1, 2}), levels({4}), levels({1, 2})},
   };

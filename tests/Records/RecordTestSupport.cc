@@ -53,21 +53,28 @@ std::string randomChars(std::mt19937_64& random, std::size_t maxLength, int firs
 
 Value randomValue(FieldKind kind, std::mt19937_64& random) {
   switch (kind) {
-    case FieldKind::UInt64: return Value(randomUnsigned(random));
-    case FieldKind::UInt32: return Value(randomUnsigned(random) & 0xFFFFFFFFu);
-    case FieldKind::SInt64: return Value(randomSigned(random));
-    case FieldKind::Int32: return Value(static_cast<long long>(static_cast<std::int32_t>(randomSigned(random))));
-    case FieldKind::Bool: return Value(random() % 2 == 0);
+    case FieldKind::UInt64:
+      return Value(randomUnsigned(random));
+    case FieldKind::UInt32:
+      return Value(randomUnsigned(random) & 0xFFFFFFFFu);
+    case FieldKind::SInt64:
+      return Value(randomSigned(random));
+    case FieldKind::Int32:
+      return Value(static_cast<long long>(static_cast<std::int32_t>(randomSigned(random))));
+    case FieldKind::Bool:
+      return Value(random() % 2 == 0);
     case FieldKind::Double:
       if (random() % 3 == 0) return Value(random() % 2 ? 0.0 : -1.5e300);
       return Value(random() % 2 ? static_cast<double>(randomSigned(random)) / 7.0
                                 : std::uniform_real_distribution<double>(-1000, 1000)(random));
-    case FieldKind::String: return Value(randomChars(random, 24, ' ', 95));
+    case FieldKind::String:
+      return Value(randomChars(random, 24, ' ', 95));
     case FieldKind::Bytes: {
       const std::string b = randomChars(random, 40, -128, 256);
       return Value(Data(b.begin(), b.end()));
     }
-    case FieldKind::Message: break;
+    case FieldKind::Message:
+      break;
   }
   return Value();
 }

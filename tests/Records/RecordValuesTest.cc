@@ -87,9 +87,15 @@ const Uuid kBoot = *Uuid::parse("6A1C1D4E-0B7F-4E3A-9C2D-5F8E7A6B4C3D");
 const std::string kRaw(kBoot.bytes().begin(), kBoot.bytes().end());
 
 Dictionary process(Dictionary status = {}) {
-  status.merge(Dictionary{{"name", "mds"}, {"pid", 321}, {"userTime", 2'500'000'000}, {"systemTime", 600'999'999},
-                          {"interruptWkups", 42}, {"residentSize", 1048576}, {"procStartAbstime", 1000},
-                          {"procExitAbstime", 3'723'000}, {"nowAbstime", 9'000'000}});
+  status.merge(Dictionary{{"name", "mds"},
+                          {"pid", 321},
+                          {"userTime", 2'500'000'000},
+                          {"systemTime", 600'999'999},
+                          {"interruptWkups", 42},
+                          {"residentSize", 1048576},
+                          {"procStartAbstime", 1000},
+                          {"procExitAbstime", 3'723'000},
+                          {"nowAbstime", 9'000'000}});
   return status;
 }
 Dictionary vector(unsigned cpu, const char* name, unsigned count) {
@@ -106,10 +112,12 @@ TEST(OneLineText, MatchesTheExpectedTextForEveryCase) {
        {{"systemVersion", "23A344"}, {"bootUuid", kRaw}, {"lastBootUuid", "12345678-9abc-DEF0-0FED-CBA987654321"}},
        "LogStartsV1\t23A344\t6A1C1D4E-0B7F-4E3A-9C2D-5F8E7A6B4C3D\t12345678-9ABC-DEF0-0FED-CBA987654321"},
       {C::LogStartsV1, {}, "LogStartsV1\t\t\t"},
-      {C::BatteryChargeLevel, {{"charge", 4321}, {"maxCharge", 5000}, {"cycleCount", 12}},
+      {C::BatteryChargeLevel,
+       {{"charge", 4321}, {"maxCharge", 5000}, {"cycleCount", 12}},
        "BatteryChargeLevel\t86.4\t4321\t5000\t12\t"},
       {C::BatteryChargeLevel, {{"charge", 5000}, {"maxCharge", 5000}}, "BatteryChargeLevel\t100\t5000\t5000\t0\t"},
-      {C::BatteryChargeLevel, {{"charge", -1}, {"maxCharge", 3}, {"cycleCount", -7}},
+      {C::BatteryChargeLevel,
+       {{"charge", -1}, {"maxCharge", 3}, {"cycleCount", -7}},
        "BatteryChargeLevel\t-33.3\t-1\t3\t-7\t"},
       {C::BatteryChargeLevel, {{"charge", 10}}, "BatteryChargeLevel\tinf\t10\t0\t0\t"},
       {C::PowerStateChange, {}, "PowerStateChange\tA/C"},
@@ -127,7 +135,8 @@ TEST(OneLineText, MatchesTheExpectedTextForEveryCase) {
       {C::ProcessUsage, process({{"exitStatus", -3}}), "ProcessUsage\tS" + sampled},
       {C::ProcessUsage, {}, "ProcessUsage\t0\t    0 msec\t00:00:00\t     0 intr wkups\tresident        0\t0 []"},
       {C::PackageEnergyStatistics, {{"pkg_cany_residency", 987}}, "PackageEnergyStatistics\t987"},
-      {C::DeviceChange, {{"deviceType", 3}, {"deviceName", "Magic Mouse"}, {"deviceId", "0x1234"}, {"nowConnected", 1}},
+      {C::DeviceChange,
+       {{"deviceType", 3}, {"deviceName", "Magic Mouse"}, {"deviceId", "0x1234"}, {"nowConnected", 1}},
        "DeviceChange\t3\t Magic Mouse (@0x1234)\tconnected"},
       {C::DeviceChange, {{"deviceType", 4}}, "DeviceChange\t4\t  (@)\tdisconnected"},
       {C::Interrupts,
@@ -135,10 +144,12 @@ TEST(OneLineText, MatchesTheExpectedTextForEveryCase) {
        "Interrupts\nCPU 0\n\tVector hpet:\t10 interrupts\n\tVector nvme:\t3 interrupts\n"
        "CPU 1\n\tVector timer:\t50 interrupts\n\tVector ipi:\t7 interrupts\n"},
       {C::Interrupts, {}, "Interrupts\n"},
-      {C::Cstates, {{"core", -1}, {"states", Array{state(1, 500), state(6, 1234567)}}},
+      {C::Cstates,
+       {{"core", -1}, {"states", Array{state(1, 500), state(6, 1234567)}}},
        "Package C-state detail: C1     500   C6 1234567   "},
       {C::Cstates, {{"is_core", false}, {"core", 0}}, "Core 0 C-state detail: "},  // core 0 is not the package
-      {C::Cstates, {{"is_core", true}, {"core", 3}, {"states", Array{state(3, 12345678)}}},
+      {C::Cstates,
+       {{"is_core", true}, {"core", 3}, {"states", Array{state(3, 12345678)}}},
        "Core 3 C-state detail: C3 12345678   "},
       {C::DisplayBrightness, {{"brightness", 75}}, "DisplayBrightness\t75%"},
       {C::FanState, {{"loudness", 2}, {"highest_rpm", 3500}}, "FanState\t2 (3500 rpm)"},
@@ -148,11 +159,12 @@ TEST(OneLineText, MatchesTheExpectedTextForEveryCase) {
 }
 
 TEST(RecordClasses, OnlyTheTwelveHaveATextAndOnlySixAWallTime) {
-  const std::set<C> withText = {C::BatteryChargeLevel, C::SleepWake, C::LogStartsV1, C::PowerStateChange,
-                                C::Cstates, C::DeviceChange, C::FanState, C::DisplayBrightness, C::UserIdle,
-                                C::ProcessUsage, C::Interrupts, C::PackageEnergyStatistics};
-  const std::set<C> withWallTime = {C::SleepWake, C::LogStartsV0, C::LogStartsV1, C::PowerStateChange,
-                                    C::DateChange, C::TimeChange};
+  const std::set<C> withText = {C::BatteryChargeLevel, C::SleepWake,         C::LogStartsV1,
+                                C::PowerStateChange,   C::Cstates,           C::DeviceChange,
+                                C::FanState,           C::DisplayBrightness, C::UserIdle,
+                                C::ProcessUsage,       C::Interrupts,        C::PackageEnergyStatistics};
+  const std::set<C> withWallTime = {C::SleepWake,        C::LogStartsV0, C::LogStartsV1,
+                                    C::PowerStateChange, C::DateChange,  C::TimeChange};
   for (RecordClass c : test::allRecordClasses()) {
     Dictionary times;  // the fields named wallTime and absoluteTime, whatever their keys
     for (const FieldInfo& f : recordSchema(c).fields) {
@@ -169,8 +181,8 @@ TEST(RecordClasses, OnlyTheTwelveHaveATextAndOnlySixAWallTime) {
 }
 
 TEST(ProcessUsage, TimeIsNowForRunningOrSampledProcessesAndTheExitOtherwise) {
-  const std::pair<std::optional<std::int64_t>, std::uint64_t> cases[] = {
-      {-1, 5000}, {-3, 5000}, {-2, 3000}, {0, 3000}, {1, 3000}, {std::nullopt, 3000}};
+  const std::pair<std::optional<std::int64_t>, std::uint64_t> cases[] = {{-1, 5000}, {-3, 5000}, {-2, 3000},
+                                                                         {0, 3000},  {1, 3000},  {std::nullopt, 3000}};
   for (const auto& [status, expected] : cases) {
     Dictionary fields = {{"nowAbstime", 5000}, {"procExitAbstime", 3000}, {"procStartAbstime", 1000}};
     if (status) fields["exitStatus"] = *status;

@@ -24,10 +24,10 @@ class SchemaCrossCheck : public ::testing::Test {
   // Compiles the schema into a descriptor set on protoc's standard output
   // and builds the library's descriptors from it.
   static void SetUpTestSuite() {
-    const auto dir = std::filesystem::path(__FILE__).parent_path().parent_path().parent_path() / "src" / "Records";
-    const test::ToolResult result = test::runBinary(
-        "/usr/bin/env", {"protoc", "--proto_path=" + dir.string(), "--descriptor_set_out=/dev/stdout",
-                         (dir / "brindlewick.proto").string()});
+    const auto dir = std::filesystem::path(BRINDLEWICK_SOURCE_DIR) / "src" / "Records";
+    const test::ToolResult result =
+        test::runBinary("/usr/bin/env", {"protoc", "--proto_path=" + dir.string(), "--descriptor_set_out=/dev/stdout",
+                                         (dir / "brindlewick.proto").string()});
     pb::FileDescriptorSet set;
     if (result.status != 0 || !set.ParseFromString(result.out) || set.file_size() != 1) {
       problem_ = "protoc (from the PATH) failed: " + result.err;
@@ -48,7 +48,7 @@ class SchemaCrossCheck : public ::testing::Test {
 };
 
 // The library's name of each field kind's type, in FieldKind order.
-const char* const kTypeNames[] = {"uint64", "sint64", "uint32", "int32", "bool",
+const char* const kTypeNames[] = {"uint64", "sint64", "uint32", "int32",  "bool",
                                   "double", "string", "bytes",  "message"};
 
 // The dynamic message in the dictionary form the records give, each value
@@ -61,13 +61,27 @@ Dictionary dictionaryOf(const pb::Message& m, const RecordSchema& schema) {
     if (fd == nullptr || (fd->is_repeated() ? r->FieldSize(m, fd) == 0 : !r->HasField(m, fd))) continue;
     Value& v = d[f.key];
     switch (fd->type()) {
-      case FieldDescriptor::TYPE_UINT64: v = Value(static_cast<unsigned long long>(r->GetUInt64(m, fd))); break;
-      case FieldDescriptor::TYPE_UINT32: v = Value(static_cast<unsigned long long>(r->GetUInt32(m, fd))); break;
-      case FieldDescriptor::TYPE_SINT64: v = Value(static_cast<long long>(r->GetInt64(m, fd))); break;
-      case FieldDescriptor::TYPE_INT32: v = Value(static_cast<long long>(r->GetInt32(m, fd))); break;
-      case FieldDescriptor::TYPE_BOOL: v = Value(r->GetBool(m, fd)); break;
-      case FieldDescriptor::TYPE_DOUBLE: v = Value(r->GetDouble(m, fd)); break;
-      case FieldDescriptor::TYPE_STRING: v = Value(r->GetString(m, fd)); break;
+      case FieldDescriptor::TYPE_UINT64:
+        v = Value(static_cast<unsigned long long>(r->GetUInt64(m, fd)));
+        break;
+      case FieldDescriptor::TYPE_UINT32:
+        v = Value(static_cast<unsigned long long>(r->GetUInt32(m, fd)));
+        break;
+      case FieldDescriptor::TYPE_SINT64:
+        v = Value(static_cast<long long>(r->GetInt64(m, fd)));
+        break;
+      case FieldDescriptor::TYPE_INT32:
+        v = Value(static_cast<long long>(r->GetInt32(m, fd)));
+        break;
+      case FieldDescriptor::TYPE_BOOL:
+        v = Value(r->GetBool(m, fd));
+        break;
+      case FieldDescriptor::TYPE_DOUBLE:
+        v = Value(r->GetDouble(m, fd));
+        break;
+      case FieldDescriptor::TYPE_STRING:
+        v = Value(r->GetString(m, fd));
+        break;
       case FieldDescriptor::TYPE_BYTES: {
         const std::string b = r->GetString(m, fd);
         v = Value(Data(b.begin(), b.end()));

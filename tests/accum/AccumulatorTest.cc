@@ -45,10 +45,9 @@ TEST(DataSet, KeepsSamplesInPositionOrderWithoutMerging) {
 
 TEST(DataSet, IndexRangeListsSamplesFromLocationUpToEnd) {
   DataSet set = samples({{10, 1}, {20, 2}, {30, 3}});
-  const std::pair<Range, Range> cases[] = {
-      {{10, 20}, {0, 2}}, {{11, 9}, {2, 0}}, {{11, 10}, {1, 1}}, {{40, 5}, {3, 0}}, {{0, 100}, {0, 3}},
-      {{30, 1}, {2, 1}},  {{0, 11}, {0, 1}}, {{0, 10}, {1, 0}},  {{5, 0}, {1, 0}},  {{20, 0}, {2, 0}},
-      {{19, 2}, {1, 1}}};
+  const std::pair<Range, Range> cases[] = {{{10, 20}, {0, 2}}, {{11, 9}, {2, 0}}, {{11, 10}, {1, 1}}, {{40, 5}, {3, 0}},
+                                           {{0, 100}, {0, 3}}, {{30, 1}, {2, 1}}, {{0, 11}, {0, 1}},  {{0, 10}, {1, 0}},
+                                           {{5, 0}, {1, 0}},   {{20, 0}, {2, 0}}, {{19, 2}, {1, 1}}};
   for (auto [range, expected] : cases) EXPECT_EQ(set.indexRangeForRange(range), expected) << range.location;
   EXPECT_EQ(set.indexRangeForRange({15, UINT64_MAX}).length, 0u);  // an end that wraps selects nothing
   EXPECT_EQ(samples({{10, 1}, {10, 2}, {10, 3}, {20, 4}}).indexRangeForRange({10, 1}), (Range{0, 3}));
@@ -58,13 +57,15 @@ TEST(DataSet, IndexRangeListsSamplesFromLocationUpToEnd) {
 
 TEST(DataSet, StatisticsOverTheSamplesInARange) {
   DataSet set = samples({{10, 4}, {20, 1}, {30, 7}, {40, 2}});
-  const std::pair<Range, std::vector<double>> cases[] = {  // max, min, mean, median, weighted mean
+  const std::pair<Range, std::vector<double>> cases[] = {
+      // max, min, mean, median, weighted mean
       {{0, 100}, {7, 1, 3.5, 3, (10 * 4 + 10 * 1 + 10 * 7 + 10 * 2) / 40.0}},
       {{10, 21}, {7, 1, 4, 4, 4}},
       {{10, 11}, {4, 1, 2.5, 2.5, 1}},  // the first sample weighs nothing: it stands at the range start
-      {{40, 1}, {2, 2, 2, 2, 2}},     // a single sample answers its own value whatever its weight
+      {{40, 1}, {2, 2, 2, 2, 2}},       // a single sample answers its own value whatever its weight
       {{15, 10}, {1, 1, 1, 1, 1}},
-      {{0, 10}, {NAN, NAN, NAN, NAN, NAN}}, {{11, 5}, {NAN, NAN, NAN, NAN, NAN}}};
+      {{0, 10}, {NAN, NAN, NAN, NAN, NAN}},
+      {{11, 5}, {NAN, NAN, NAN, NAN, NAN}}};
   for (const auto& [r, expected] : cases) {
     expectSame({set.maxValueInRange(r), set.minValueInRange(r), set.meanValueInRange(r), set.medianValueInRange(r),
                 set.weightedMeanValueInRange(r)},
@@ -97,13 +98,13 @@ TEST(DataSet, DataPointsFollowTheRulesInOrder) {
   const DataSet four = samples({{10, 1}, {20, 2}, {30, 3}, {40, 4}}), one = samples({{10, 1}}), none;
   // The set, the position, the approach, hold, and the positions of the chosen samples.
   const std::tuple<const DataSet&, std::uint64_t, std::int32_t, bool, std::vector<std::uint64_t>> cases[] = {
-      {four, 20, -1, false, {20}},    {four, 20, 1, false, {20}},       {four, 20, 0, true, {20}},
+      {four, 20, -1, false, {20}},     {four, 20, 1, false, {20}},      {four, 20, 0, true, {20}},
       {four, 35, -1, false, {20, 30}}, {four, 45, -1, false, {30, 40}}, {four, 15, -1, true, {}},
-      {four, 5, -1, true, {}},        {four, 15, 0, false, {10, 20}},   {four, 5, 0, false, {}},
-      {four, 5, 0, true, {10}},       {four, 45, 0, true, {40}},        {four, 45, 0, false, {}},
-      {four, 15, 1, false, {20, 30}}, {four, 5, 1, false, {10, 20}},    {four, 35, 1, true, {}},
-      {four, 45, 1, true, {}},        {four, 45, -1, true, {30, 40}},   {one, 5, 1, true, {10}},
-      {one, 5, 1, false, {}},         {one, 20, -1, true, {10}},        {one, 5, -1, true, {}},
+      {four, 5, -1, true, {}},         {four, 15, 0, false, {10, 20}},  {four, 5, 0, false, {}},
+      {four, 5, 0, true, {10}},        {four, 45, 0, true, {40}},       {four, 45, 0, false, {}},
+      {four, 15, 1, false, {20, 30}},  {four, 5, 1, false, {10, 20}},   {four, 35, 1, true, {}},
+      {four, 45, 1, true, {}},         {four, 45, -1, true, {30, 40}},  {one, 5, 1, true, {10}},
+      {one, 5, 1, false, {}},          {one, 20, -1, true, {10}},       {one, 5, -1, true, {}},
       {none, 5, 0, true, {}}};
   for (const auto& [set, p, approach, hold, expected] : cases) {
     DataPoint points[2];
@@ -115,9 +116,12 @@ TEST(DataSet, DataPointsFollowTheRulesInOrder) {
 
 TEST(ListStatistics, SumMeanMedianMinMaxAndRanges) {
   const double kMax = std::numeric_limits<double>::max(), kInf = std::numeric_limits<double>::infinity();
-  const std::pair<std::vector<double>, std::vector<double>> cases[] = {  // sum, mean, median, min, max
-      {{}, {0, NAN, NAN, NAN, NAN}},          {{3, 1, 2}, {6, 2, 2, 1, 3}},
-      {{4, 1, 3, 2}, {10, 2.5, 2.5, 1, 4}},  {{-5}, {-5, -5, -5, -5, -5}},
+  const std::pair<std::vector<double>, std::vector<double>> cases[] = {
+      // sum, mean, median, min, max
+      {{}, {0, NAN, NAN, NAN, NAN}},
+      {{3, 1, 2}, {6, 2, 2, 1, 3}},
+      {{4, 1, 3, 2}, {10, 2.5, 2.5, 1, 4}},
+      {{-5}, {-5, -5, -5, -5, -5}},
       {{2, 2, 9, 2}, {15, 3.75, 2, 2, 9}},
       {{kInf}, {kInf, kInf, kInf, kMax, kInf}},  // min starts at the largest finite double
       {{-kInf}, {-kInf, -kInf, -kInf, -kInf, -kMax}}};
@@ -155,7 +159,7 @@ TEST(Interpolator, ValuesAreLinearBetweenWholeNumberSamplesHeldOutsideAndExtrapo
   s.extrapolateValueAtPosition(20);
   EXPECT_EQ(samplesOf(s), (Samples{{0, 0}, {10, 100}, {20, 200}}));
   auto whole = series({{10, 3.7}, {20, 9.99}, {30, -4}, {33, 10}});  // truncated; negative samples kept as 0
-  whole.extrapolateValueAtPosition(34);                                  // 13.33... on the line through 30 and 33
+  whole.extrapolateValueAtPosition(34);                              // 13.33... on the line through 30 and 33
   EXPECT_EQ(samplesOf(whole), (Samples{{10, 3}, {20, 9}, {30, 0}, {33, 10}, {34, 13}}));
   auto before = series({{10, 100}, {20, 200}, {30, 400}});
   before.extrapolateValueAtPosition(5);   // on the line through 10 and 20
@@ -168,12 +172,13 @@ TEST(Interpolator, ValuesAreLinearBetweenWholeNumberSamplesHeldOutsideAndExtrapo
 
 TEST(Interpolator, InterpolatesAndExtrapolatesThroughTheChosenPoints) {
   auto s = series({{10, 10}, {20, 20}, {30, 40}});  // slopes: 1 per unit from 10 to 20, 2 from 20 to 30
-  const std::tuple<std::uint64_t, std::int32_t, bool, double> cases[] = {  // position, approach, hold, value
+  const std::tuple<std::uint64_t, std::int32_t, bool, double> cases[] = {
+      // position, approach, hold, value
       {25, 0, false, 30},  {25, -1, false, 25},  // line through 10 and 20, extended
       {25, 1, false, NAN}, {5, 1, false, 5},     // line through 10 and 20, backwards
-      {35, -1, false, 50}, {35, 0, false, NAN},  {35, 0, true, 40},
-      {15, -1, true, NAN}, {15, 1, true, 10},    // line through 20 and 30 at 15
-      {20, -1, false, 20}, {5, 0, true, 10},     {5, -1, true, NAN}};
+      {35, -1, false, 50}, {35, 0, false, NAN}, {35, 0, true, 40},
+      {15, -1, true, NAN}, {15, 1, true, 10},  // line through 20 and 30 at 15
+      {20, -1, false, 20}, {5, 0, true, 10},    {5, -1, true, NAN}};
   for (auto [p, approach, hold, expected] : cases)
     expectSame({s.interpolateValueAtPosition(p, approach, hold)}, {expected}, "at " + std::to_string(p));
 }
@@ -216,12 +221,18 @@ TEST(SawtoothInterpolator, AverageSlopeOverPartsOfSegments) {
   // Segments {(0,0), (10,5), (20,10)}, {(30,3), (40,7)}, {(50,1), (60,3)}.
   auto s = series<SawtoothInterpolator>({{10, 5}, {20, 10}, {30, 3}, {40, 7}, {50, 1}, {60, 3}});
   ASSERT_EQ(s.segments().size(), 3u);
-  const std::tuple<const char*, std::uint64_t, std::uint64_t, double> cases[] = {  // NaN: no answer
-      {"equal ends", 25, 25, 0}, {"inside the first segment", 5, 15, 0.5}, {"whole middle segment", 25, 45, 0.4},
+  const std::tuple<const char*, std::uint64_t, std::uint64_t, double> cases[] = {
+      // NaN: no answer
+      {"equal ends", 25, 25, 0},
+      {"inside the first segment", 5, 15, 0.5},
+      {"whole middle segment", 25, 45, 0.4},
       {"from inside the first to inside the second", 15, 35, (10 - 7.5 + 5 - 3) / (5.0 + 5.0)},
-      {"across all three", 0, 60, (10.0 + 4 + 2) / (20 + 10 + 10)}, {"starting in a gap", 22, 40, 4.0 / 10.0},
-      {"past the end extends the last line", 50, 80, 6.0 / 30.0}, {"inside one gap", 22, 28, NAN},
-      {"starting past every segment covers nothing", 70, 80, NAN}, {"ending in a gap", 5, 25, (10 - 2.5) / 15.0}};
+      {"across all three", 0, 60, (10.0 + 4 + 2) / (20 + 10 + 10)},
+      {"starting in a gap", 22, 40, 4.0 / 10.0},
+      {"past the end extends the last line", 50, 80, 6.0 / 30.0},
+      {"inside one gap", 22, 28, NAN},
+      {"starting past every segment covers nothing", 70, 80, NAN},
+      {"ending in a gap", 5, 25, (10 - 2.5) / 15.0}};
   for (auto [what, from, to, expected] : cases) expectSame({s.averageSlopeFrom(from, to)}, {expected}, what);
   auto single = series<SawtoothInterpolator>({{10, 5}, {20, 10}, {30, 3}});  // a last one-sample segment: no line
   const double extended = series<SawtoothInterpolator>({{10, 5}}).averageSlopeFrom(0, 20);  // (0,0)-(10,5) extended
@@ -268,10 +279,13 @@ TEST(Ledger, TimeAboveZeroOverRange) {
     Range range;
     std::uint64_t expected;
   } const cases[] = {
-      {"two intervals inside", {10, 30}, {20, 40}, {0, 100}, 20}, {"range cuts both", {10, 30}, {20, 40}, {15, 20}, 10},
+      {"two intervals inside", {10, 30}, {20, 40}, {0, 100}, 20},
+      {"range cuts both", {10, 30}, {20, 40}, {15, 20}, 10},
       {"debit past the end with no credit counts the whole range", {}, {500}, {0, 100}, 100},
-      {"debit inside with no credit counts nothing", {}, {50}, {0, 100}, 0}, {"no records", {}, {}, {0, 100}, 0},
-      {"first credit beyond the end", {200}, {100}, {0, 100}, 0}, {"empty range", {10}, {20}, {15, 0}, 0},
+      {"debit inside with no credit counts nothing", {}, {50}, {0, 100}, 0},
+      {"no records", {}, {}, {0, 100}, 0},
+      {"first credit beyond the end", {200}, {100}, {0, 100}, 0},
+      {"empty range", {10}, {20}, {15, 0}, 0},
       {"interval still open at the end", {10}, {}, {0, 100}, 90},
       {"interval open before the range", {10}, {}, {50, 20}, 20},
       {"interval closed after the range end", {10}, {200}, {0, 100}, 90},

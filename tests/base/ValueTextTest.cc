@@ -11,8 +11,7 @@ namespace {
 
 TEST(ValueText, NestedDictionaryAndArrayIndentFourSpacesPerLevel) {
   Dictionary inner{{"level", Value(std::uint64_t{1})}, {"residency", Value(std::uint64_t{250})}};
-  Dictionary outer{{"absolute_time", Value(std::uint64_t{5})},
-                   {"states", Value(Array{Value(inner), Value(inner)})}};
+  Dictionary outer{{"absolute_time", Value(std::uint64_t{5})}, {"states", Value(Array{Value(inner), Value(inner)})}};
   EXPECT_EQ(describeValue(Value(outer)),
             "{\n"
             "    absolute_time = 5;\n"

@@ -58,9 +58,13 @@ TEST_F(CommandLine, ListFilesIgnoresTheSampleRangeAndFilters) {
 }
 
 TEST_F(CommandLine, GoodValuesAreAccepted) {
-  for (std::vector<std::string> value : {std::vector<std::string>{"-d", "20240230"}, {"-d", "yesterday"},
-                                         {"-A", "1:30"}, {"-R", "5000.1000"}, {"-b", "current"},
-                                         {"-B", "current"}, {"-S", "A/C,Wake"}}) {
+  for (std::vector<std::string> value : {std::vector<std::string>{"-d", "20240230"},
+                                         {"-d", "yesterday"},
+                                         {"-A", "1:30"},
+                                         {"-R", "5000.1000"},
+                                         {"-b", "current"},
+                                         {"-B", "current"},
+                                         {"-S", "A/C,Wake"}}) {
     value.insert(value.end(), {"-f", store.path(), "-L"});
     ToolResult r = run(value);
     EXPECT_EQ(r.status, 0) << value[0] << " " << value[1] << ": " << r.err;
@@ -98,8 +102,8 @@ TEST_F(CommandLine, AmbiguousLongPrefixesAreUsageErrorsAndUniqueOnesWork) {
   EXPECT_EQ(start.status, 0);
   EXPECT_EQ(start.err,
             "Looking for launchd files modified since 2024-01-02 03:04:00 +0000\n"
-            "Adding files from " + store.path() +
-                " recursively (periodic files newer than 0001-01-01 00:00:00 +0000)\n");
+            "Adding files from " +
+                store.path() + " recursively (periodic files newer than 0001-01-01 00:00:00 +0000)\n");
 }
 
 TEST_F(CommandLine, StartIsReadInTheProcesssTimeZone) {

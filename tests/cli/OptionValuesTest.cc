@@ -169,8 +169,8 @@ TEST_F(OptionValues, LaunchdTestHappensWhenTheOptionIsRead) {
 
 TEST_F(OptionValues, DailyWithASampleRangeIsRefused) {
   fake.ppid = 1;
-  for (std::vector<std::string> range : {std::vector<std::string>{"-d", "today"}, {"-A", "1"}, {"-R", "1.2"},
-                                         {"-s", "x"}}) {
+  for (std::vector<std::string> range :
+       {std::vector<std::string>{"-d", "today"}, {"-A", "1"}, {"-R", "1.2"}, {"-s", "x"}}) {
     std::vector<std::string> args{"--daily"};
     args.insert(args.end(), range.begin(), range.end());
     Parsed p = parse(args);

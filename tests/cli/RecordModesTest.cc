@@ -36,14 +36,17 @@ const char* const kModel1Events =
     "2024-01-01 00:01:10\tSleep\n"
     "2024-01-01 00:11:11\tDarkWake from Standby (EC.LidOpen)\n"
     "2024-01-01 00:11:12\tUserIdle\tIdle\n"
-    "2024-01-01 00:15:00\tLogStartsV1\t20A1\tBBBBBBBB-0000-0000-0000-000000000002\tAAAAAAAA-0000-0000-0000-000000000001\n"
+    "2024-01-01 "
+    "00:15:00\tLogStartsV1\t20A1\tBBBBBBBB-0000-0000-0000-000000000002\tAAAAAAAA-0000-0000-0000-000000000001\n"
     "2024-01-01 00:15:01\tBatteryChargeLevel\t76\t3800\t5000\t12\t\n"
     "2024-01-01 00:15:11\tBatteryChargeLevel\t74\t3700\t5000\t12\t\n";
 
 const char* const kBootCHeader1 =
-    "2024-01-01 00:30:00\tLogStartsV1\t21B5\tCCCCCCCC-0000-0000-0000-000000000003\tBBBBBBBB-0000-0000-0000-000000000002\n";
+    "2024-01-01 "
+    "00:30:00\tLogStartsV1\t21B5\tCCCCCCCC-0000-0000-0000-000000000003\tBBBBBBBB-0000-0000-0000-000000000002\n";
 const char* const kBootCHeader2 =
-    "2024-01-01 01:36:40\tLogStartsV1\t21B5\tCCCCCCCC-0000-0000-0000-000000000003\tBBBBBBBB-0000-0000-0000-000000000002\n";
+    "2024-01-01 "
+    "01:36:40\tLogStartsV1\t21B5\tCCCCCCCC-0000-0000-0000-000000000003\tBBBBBBBB-0000-0000-0000-000000000002\n";
 
 // The whole timeline is one range that ends at the last record, so each
 // model's last record (the A/C change in boot B, the user activity in boot
@@ -66,8 +69,12 @@ TEST_F(RecordModes, EventListingWithDebugShowsPositionsTicksAndOwnWallTimes) {
             "670000\t71000\t*2024-01-01 00:11:11 +0000\tDarkWake from Standby (EC.LidOpen)\n");
   EXPECT_EQ(r.err, "Adding files from " + store->path() +
                        " recursively (periodic files newer than 0001-01-01 00:00:00 +0000)\n"
-                       "Skipping (System Version <20A1>): " + store->path() + "/var/log/com.vexil.launchd.peruser.501/C2.stats\n"
-                       "Skipping (System Version <20A1>): " + store->path() + "/var/log/com.vexil.launchd/C1.stats\n"
+                       "Skipping (System Version <20A1>): " +
+                       store->path() +
+                       "/var/log/com.vexil.launchd.peruser.501/C2.stats\n"
+                       "Skipping (System Version <20A1>): " +
+                       store->path() +
+                       "/var/log/com.vexil.launchd/C1.stats\n"
                        "Selecting events from 3000 to 670000\n");
 }
 
@@ -79,8 +86,7 @@ TEST_F(RecordModes, DaySelectionStartsAtTheFirstTimeZoneRecord) {
 }
 
 TEST_F(RecordModes, DatesPrintInTheProcesssZoneWhileTheDayFollowsTheRecordedZone) {
-  test::ToolResult r = run({"--debug", "-d", "20240101", "-B", "AAAAAAAA-0000-0000-0000-000000000001",
-                            "--show-events"},
+  test::ToolResult r = run({"--debug", "-d", "20240101", "-B", "AAAAAAAA-0000-0000-0000-000000000001", "--show-events"},
                            "America/New_York");
   EXPECT_EQ(r.status, 0);
   EXPECT_EQ(r.out,

@@ -2,6 +2,7 @@
 
 #include <vector>
 
+#include "Support.h"
 #include "domains/AbsoluteDomain.h"
 #include "domains/AllDomain.h"
 #include "domains/BootDomain.h"
@@ -11,7 +12,6 @@
 #include "domains/RelativeTimeDomain.h"
 #include "domains/WallTimeDomain.h"
 #include "domains/WallTimeText.h"
-#include "Support.h"
 
 namespace bw {
 namespace {

@@ -2,8 +2,8 @@
 
 #include <vector>
 
-#include "domains/DateDomain.h"
 #include "Support.h"
+#include "domains/DateDomain.h"
 
 namespace bw {
 namespace {

@@ -2,6 +2,7 @@
 
 #include <vector>
 
+#include "Support.h"
 #include "cli/Options.h"
 #include "domains/AbsoluteDomain.h"
 #include "domains/AllDomain.h"
@@ -10,7 +11,6 @@
 #include "domains/PostInstallDomain.h"
 #include "domains/RelativeTimeDomain.h"
 #include "domains/WallTimeDomain.h"
-#include "Support.h"
 
 namespace bw {
 namespace {

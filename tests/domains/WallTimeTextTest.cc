@@ -26,8 +26,14 @@ std::string icuText(std::uint64_t ms, const char* pattern) {
 // dates, with and without the offset.
 TEST(WallTimeText, MatchesTheCalendarFormatterEverywhere) {
   std::mt19937_64 random(11);
-  std::vector<std::uint64_t> instants = {0, 1711846799999, 1711846800000, 1729990800000, 1729994400000,
-                                         253402300799999, 253402300800000, ~std::uint64_t{0}};
+  std::vector<std::uint64_t> instants = {0,
+                                         1711846799999,
+                                         1711846800000,
+                                         1729990800000,
+                                         1729994400000,
+                                         253402300799999,
+                                         253402300800000,
+                                         ~std::uint64_t{0}};
   for (int i = 0; i < 3000; ++i) instants.push_back(random() % 4102444800000);  // up to 2100
   for (int i = 0; i < 200; ++i) instants.push_back(1711846800000 + random() % 7200000 - 3600000);
   for (int debug : {0, 1}) {

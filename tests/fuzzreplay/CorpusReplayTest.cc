@@ -18,7 +18,7 @@ namespace {
 
 namespace fs = std::filesystem;
 
-fs::path corpusDirectory() { return fs::path(__FILE__).parent_path().parent_path() / "fuzz" / "corpus"; }
+fs::path corpusDirectory() { return fs::path(BRINDLEWICK_SOURCE_DIR) / "tests" / "fuzz" / "corpus"; }
 
 std::vector<fs::path> corpusFiles() {
   std::vector<fs::path> files;

@@ -32,7 +32,8 @@ std::map<std::string, std::pair<std::string, long long>> snapshot(const std::str
     bytes << in.rdbuf();
     struct stat st {};
     stat(entry.path().c_str(), &st);
-    files[fs::relative(entry.path(), root).string()] = {bytes.str(), st.st_mtim.tv_sec * 1'000'000'000LL + st.st_mtim.tv_nsec};
+    files[fs::relative(entry.path(), root).string()] = {bytes.str(),
+                                                        st.st_mtim.tv_sec * 1'000'000'000LL + st.st_mtim.tv_nsec};
   }
   return files;
 }
@@ -66,21 +67,25 @@ TEST(SampleStoreGenerator, RefusesToWriteIntoANonEmptyDirectory) {
 TEST(SampleStoreGenerator, ProgramWritesWhatTheLibraryWritesPresetsYieldToOptionsAndBadArgumentsFail) {
   const std::string program = BRINDLEWICK_TOOLS_DIR "/samplestore/brindlewick-samplestore";
   bw::test::TempDir dir;
-  const auto result = bw::test::runBinary(program, {"--days", "2", "--scale", "20", "--seed", "5", "--output", dir / "p"});
+  const auto result =
+      bw::test::runBinary(program, {"--days", "2", "--scale", "20", "--seed", "5", "--output", dir / "p"});
   ASSERT_EQ(result.status, 0) << result.err;
   const StoreReport report = generateSampleStore(smallConfig(dir / "l", 5));
   EXPECT_NE(result.out.find(std::to_string(report.totalRecords()) + " records"), std::string::npos) << result.out;
   EXPECT_EQ(snapshot(dir / "p"), snapshot(dir / "l"));
 
-  const auto quiet = bw::test::runBinary(program, {"--preset", "large", "--days", "1", "--scale", "10", "-q", "--output", dir / "s"});
+  const auto quiet =
+      bw::test::runBinary(program, {"--preset", "large", "--days", "1", "--scale", "10", "-q", "--output", dir / "s"});
   ASSERT_EQ(quiet.status, 0) << quiet.err;
   EXPECT_EQ(quiet.out, "");
   generateSampleStore(StoreConfig{.days = 1, .seed = largePreset().seed, .scale = 10, .output = dir / "t"});
   EXPECT_EQ(snapshot(dir / "s"), snapshot(dir / "t"));
 
-  for (const std::vector<std::string>& args :
-       {std::vector<std::string>{"--days", "2"}, {"--output", dir / "q", "--days", "0"}, {"--output", dir / "q", "--scale", "x"},
-        {"--output", dir / "q", "--preset", "huge"}, {"--output", dir / "q", "extra"}}) {
+  for (const std::vector<std::string>& args : {std::vector<std::string>{"--days", "2"},
+                                               {"--output", dir / "q", "--days", "0"},
+                                               {"--output", dir / "q", "--scale", "x"},
+                                               {"--output", dir / "q", "--preset", "huge"},
+                                               {"--output", dir / "q", "extra"}}) {
     EXPECT_EQ(bw::test::runBinary(program, args).status, 64) << args.back();
   }
   EXPECT_FALSE(fs::exists(dir / "q"));
@@ -103,12 +108,15 @@ TEST(SampleStoreWallClock, CivilDaysWeekdaysYearDaysAndSavingTimeSwitches) {
 
   const auto find = [](const char* name) {
     const auto& table = zoneTable();
-    return *std::find_if(table.begin(), table.end(), [&](const ZoneRule& r) { return std::string(r.standard) == name; });
+    return *std::find_if(table.begin(), table.end(),
+                         [&](const ZoneRule& r) { return std::string(r.standard) == name; });
   };
   const std::uint64_t year2024 = 1'704'067'200'000, year2025 = 1'735'689'600'000;
   // North America: 10 March 2024 02:00 PST and 3 November 2024 02:00 PDT; Europe: 31 March and 27 October, 01:00 UTC.
-  EXPECT_EQ(savingSwitches(find("PST"), year2024, year2025), (std::vector<std::uint64_t>{1'710'064'800'000, 1'730'624'400'000}));
-  EXPECT_EQ(savingSwitches(find("CET"), year2024, year2025), (std::vector<std::uint64_t>{1'711'846'800'000, 1'729'990'800'000}));
+  EXPECT_EQ(savingSwitches(find("PST"), year2024, year2025),
+            (std::vector<std::uint64_t>{1'710'064'800'000, 1'730'624'400'000}));
+  EXPECT_EQ(savingSwitches(find("CET"), year2024, year2025),
+            (std::vector<std::uint64_t>{1'711'846'800'000, 1'729'990'800'000}));
   EXPECT_TRUE(savingSwitches(find("JST"), year2024, year2025).empty());
   const Zone summer = zoneAt(find("CET"), 1'720'000'000'000);
   EXPECT_STREQ(summer.name, "CEST");
@@ -161,13 +169,16 @@ TEST(SampleStorePlan, RunsAlternateWithSleepsAndStatesStayInsideRuns) {
     EXPECT_EQ(updates, 1);
     EXPECT_EQ(all.back()->end, RunEnd::Running);
     const auto inFullRun = [&](std::uint64_t wall) {
-      return std::any_of(all.begin(), all.end(), [&](const samplestore::Run* r) { return !r->dark && r->wallStart < wall && wall <= r->wallEnd(); });
+      return std::any_of(all.begin(), all.end(), [&](const samplestore::Run* r) {
+        return !r->dark && r->wallStart < wall && wall <= r->wallEnd();
+      });
     };
     for (std::size_t i = 1; i < plan.powerSources().size(); ++i) {
       EXPECT_TRUE(inFullRun(plan.powerSources()[i].wall)) << "power source change " << i;
       EXPECT_NE(plan.powerSources()[i].onAC, plan.powerSources()[i - 1].onAC);
     }
-    for (const Interval& idle : plan.idle()) EXPECT_TRUE(idle.start < idle.end && inFullRun(idle.start + 1) && inFullRun(idle.end));
+    for (const Interval& idle : plan.idle())
+      EXPECT_TRUE(idle.start < idle.end && inFullRun(idle.start + 1) && inFullRun(idle.end));
     EXPECT_GE(plan.zoneSwitches().size(), 2u);  // twelve days include a trip there and back
   }
 }

@@ -32,11 +32,13 @@ TEST(SampleStoreContents, ReaderFindsEveryRecordTheGeneratorReportsPerClass) {
     for (const Record* r : records) ++read[static_cast<std::size_t>(r->recordClass())];
   }
   for (int k = 0; k < kRecordClassCount; ++k) {
-    EXPECT_EQ(read[static_cast<std::size_t>(k)], store.report.records[static_cast<std::size_t>(k)]) << recordClassName(static_cast<RecordClass>(k));
+    EXPECT_EQ(read[static_cast<std::size_t>(k)], store.report.records[static_cast<std::size_t>(k)])
+        << recordClassName(static_cast<RecordClass>(k));
   }
   EXPECT_EQ(store.read.boots.size(), store.report.boots.size());
   // Sub-message classes never stand alone; the rest all occur.
-  for (RecordClass absent : {RecordClass::LogStartsV0, RecordClass::Cstate, RecordClass::SmcKey, RecordClass::InterruptVector}) {
+  for (RecordClass absent :
+       {RecordClass::LogStartsV0, RecordClass::Cstate, RecordClass::SmcKey, RecordClass::InterruptVector}) {
     EXPECT_EQ(store.report.records[static_cast<std::size_t>(absent)], 0u) << recordClassName(absent);
   }
   EXPECT_EQ(std::count(store.report.records.begin(), store.report.records.end(), 0u), 4);
@@ -53,7 +55,8 @@ TEST(SampleStoreContents, FilesLieInTheStoreLayoutNamedByBootAndDatedByTheirLast
     const BootSummary& boot = store.report.boots.at(f.boot);
     const std::string relative = f.path.substr(store.config.output.size() + 1);
     const std::string directory = relative.substr(0, relative.rfind('/'));
-    EXPECT_TRUE(directory == "var/db/brindlewick" || directory == "var/log/com.vexil.launchd" || directory == "var/log/com.vexil.launchd.peruser.501");
+    EXPECT_TRUE(directory == "var/db/brindlewick" || directory == "var/log/com.vexil.launchd" ||
+                directory == "var/log/com.vexil.launchd.peruser.501");
     EXPECT_NE(relative.find(boot.uuid.string()), std::string::npos);
     EXPECT_EQ(relative.find("periodic") != std::string::npos, f.writer == 3);
     RecordPool pool;
@@ -117,7 +120,8 @@ TEST(SampleStoreContents, BootsChainByTheirHeadersAndTheUpdateStartsANewVersion)
 
 TEST(SampleStoreContents, WallTimesShareOneSkewPerSegmentOnlyWakesStartSegmentsAndBootsBeginWithClockAndPower) {
   const auto& store = sharedStore();
-  static const std::set<std::string> zones = {"PST", "PDT", "MST", "MDT", "CST", "CDT", "EST", "EDT", "GMT", "BST", "CET", "CEST", "IST", "SGT", "JST"};
+  static const std::set<std::string> zones = {"PST", "PDT", "MST", "MDT",  "CST", "CDT", "EST", "EDT",
+                                              "GMT", "BST", "CET", "CEST", "IST", "SGT", "JST"};
   std::uint64_t lastBootEnd = 0;
   for (std::size_t b = 0; b < store.boots.size(); ++b) {
     SCOPED_TRACE("boot " + std::to_string(b));

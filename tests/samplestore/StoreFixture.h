@@ -23,7 +23,8 @@ struct SharedStore {
 inline const SharedStore& sharedStore() {
   static const std::unique_ptr<SharedStore> store = [] {
     auto s = std::make_unique<SharedStore>();
-    s->config = StoreConfig{.days = 7, .seed = 11, .scale = 30, .output = s->dir / "store"};  // a trip, a weekend and the update
+    s->config = StoreConfig{
+        .days = 7, .seed = 11, .scale = 30, .output = s->dir / "store"};  // a trip, a weekend and the update
     s->report = generateSampleStore(s->config);
     Options options;
     options.setFrom_path(s->config.output);

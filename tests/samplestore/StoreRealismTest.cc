@@ -37,8 +37,9 @@ TEST(SampleStoreRealism, ProcessorCountersOnlyGrowWithinABootAndRestartAtBoot) {
     for (std::size_t i = 1; i < pkg.size(); ++i) {
       const auto *a = pkg[i - 1], *b = pkg[i];
       EXPECT_TRUE(b->pkgC0Residency() >= a->pkgC0Residency() && b->pkgCanyResidency() >= a->pkgCanyResidency() &&
-                  b->pkgCmaxResidency() >= a->pkgCmaxResidency() && b->energyModelMillijoules() >= a->energyModelMillijoules() &&
-                  b->qosBgTime() >= a->qosBgTime() && b->qosIdleTime() >= a->qosIdleTime())
+                  b->pkgCmaxResidency() >= a->pkgCmaxResidency() &&
+                  b->energyModelMillijoules() >= a->energyModelMillijoules() && b->qosBgTime() >= a->qosBgTime() &&
+                  b->qosIdleTime() >= a->qosIdleTime())
           << "a counter went back at " << b->absoluteTime();
       EXPECT_LE(b->pkgCmaxResidency(), b->pkgCanyResidency());
       EXPECT_LE(b->pkgC0Residency() + b->pkgCanyResidency(), b->absoluteTime()) << "residency ran ahead of the clock";
@@ -47,12 +48,14 @@ TEST(SampleStoreRealism, ProcessorCountersOnlyGrowWithinABootAndRestartAtBoot) {
     std::size_t packages = 0;
     for (const Cstates* c : only<Cstates>(records)) {
       packages += c->core() == -1;
-      for (const Cstate& s : c->states()) EXPECT_GE(s.residency(), std::exchange(residency[{c->core(), s.level()}], s.residency()));
+      for (const Cstate& s : c->states())
+        EXPECT_GE(s.residency(), std::exchange(residency[{c->core(), s.level()}], s.residency()));
     }
     EXPECT_EQ(packages, pkg.size());
     std::map<std::pair<std::uint32_t, std::string>, std::uint64_t> counts;
     for (const Interrupts* in : only<Interrupts>(records)) {
-      for (const InterruptVector& v : in->vectors()) EXPECT_GE(v.interruptCount(), std::exchange(counts[{v.cpuNumber(), v.vectorName()}], v.interruptCount()));
+      for (const InterruptVector& v : in->vectors())
+        EXPECT_GE(v.interruptCount(), std::exchange(counts[{v.cpuNumber(), v.vectorName()}], v.interruptCount()));
     }
     EXPECT_FALSE(counts.empty());
   }
@@ -71,7 +74,8 @@ TEST(SampleStoreRealism, ProcessRecordsFormConsistentLivesAndFamilies) {
       if (!life.empty()) {
         const ProcessUsage* last = life.back();
         EXPECT_TRUE(last->exitStatus() == -1 || last->exitStatus() == -3) << "a record after the exit";
-        EXPECT_TRUE(p->pid() == last->pid() && p->name() == last->name() && p->procStartAbstime() == last->procStartAbstime());
+        EXPECT_TRUE(p->pid() == last->pid() && p->name() == last->name() &&
+                    p->procStartAbstime() == last->procStartAbstime());
         EXPECT_GE(p->userTime() + p->systemTime(), last->userTime() + last->systemTime()) << "CPU time went back";
       }
       EXPECT_GE(p->absoluteTime(), p->procStartAbstime());
@@ -93,10 +97,13 @@ TEST(SampleStoreRealism, ProcessRecordsFormConsistentLivesAndFamilies) {
   }
   for (std::int64_t s : {-3, -2, -1, 0}) EXPECT_TRUE(statuses.count(s)) << "exit status " << s;
   EXPECT_GT(*statuses.rbegin(), 0);
-  // Names the job-name cleaning has to deal with: a dot and an upper-case UUID, a dot and digits, a leading launcher slot.
-  for (const char* form : {R"(.+\.[0-9A-F]{8}-[0-9A-F]{4}-[0-9A-F]{4}-[0-9A-F]{4}-[0-9A-F]{12})", R"(.+\.[0-9]+)", R"(\[0x[^\]-]*-0x[^\]]*\]\..*)"}) {
+  // Names the job-name cleaning has to deal with: a dot and an upper-case UUID, a dot and digits, a leading launcher
+  // slot.
+  for (const char* form : {R"(.+\.[0-9A-F]{8}-[0-9A-F]{4}-[0-9A-F]{4}-[0-9A-F]{4}-[0-9A-F]{12})", R"(.+\.[0-9]+)",
+                           R"(\[0x[^\]-]*-0x[^\]]*\]\..*)"}) {
     const std::regex re(form);
-    EXPECT_TRUE(std::any_of(names.begin(), names.end(), [&](const std::string& n) { return std::regex_match(n, re); })) << form;
+    EXPECT_TRUE(std::any_of(names.begin(), names.end(), [&](const std::string& n) { return std::regex_match(n, re); }))
+        << form;
   }
 }
 
@@ -124,7 +131,8 @@ TEST(SampleStoreRealism, AWeekBringsEveryKindOfEventWithZonesABatteryAndDevicesT
         EXPECT_TRUE(level->charge() > 0 && level->charge() <= level->maxCharge()) << level->charge();
         EXPECT_TRUE(level->instantVoltage() >= 10'000 && level->instantVoltage() <= 13'500) << level->instantVoltage();
         EXPECT_GE(level->cycleCount(), std::exchange(cycles, level->cycleCount()));
-        EXPECT_TRUE(onAC ? level->instantAmperage() >= 0 : level->instantAmperage() < 0) << "the current follows the power source";
+        EXPECT_TRUE(onAC ? level->instantAmperage() >= 0 : level->instantAmperage() < 0)
+            << "the current follows the power source";
         charging += onAC && level->instantAmperage() > 0;
         draining += !onAC;
         EXPECT_EQ(level->lastMinuteWattage() < 0, level->instantAmperage() < 0);
@@ -141,7 +149,8 @@ TEST(SampleStoreRealism, AWeekBringsEveryKindOfEventWithZonesABatteryAndDevicesT
       } else if (const auto* d = recordCast<DeviceChange>(r)) {
         deviceTypes.insert(d->deviceType());
         const auto [it, fresh] = connected.try_emplace(d->deviceId(), 0);
-        EXPECT_TRUE((fresh && d->nowConnected() != 0) || it->second != d->nowConnected()) << d->deviceName() << " switched twice the same way";
+        EXPECT_TRUE((fresh && d->nowConnected() != 0) || it->second != d->nowConnected())
+            << d->deviceName() << " switched twice the same way";
         it->second = d->nowConnected();
       } else if (const auto* t = recordCast<TimeChange>(r)) {
         zones.insert(t->zoneName());
@@ -166,7 +175,8 @@ TEST(SampleStoreRealism, AWeekBringsEveryKindOfEventWithZonesABatteryAndDevicesT
   EXPECT_GT(deviceTypes.size(), 3u);
   EXPECT_GE(zones.size(), 2u) << "a trip to another zone";
   // The store starts on day 35 (5 February); every later day is announced by a date record or a boot's clock record.
-  for (std::uint32_t day = 36; day < 35u + static_cast<std::uint32_t>(store.config.days); ++day) EXPECT_TRUE(days.count(day)) << "day " << day;
+  for (std::uint32_t day = 36; day < 35u + static_cast<std::uint32_t>(store.config.days); ++day)
+    EXPECT_TRUE(days.count(day)) << "day " << day;
   ASSERT_FALSE(plan.zoneSwitches().empty());
   for (std::uint64_t at : plan.zoneSwitches()) {
     const auto clock = std::lower_bound(clocks.begin(), clocks.end(), at);

@@ -21,7 +21,10 @@ using test::sleepAt;
 
 class RecordReader : public ::testing::Test {
  protected:
-  void SetUp() override { gDebug = 1; setConsole(&out_, &err_); }
+  void SetUp() override {
+    gDebug = 1;
+    setConsole(&out_, &err_);
+  }
   void TearDown() override {
     gDebug = 0;
     setConsole(nullptr, nullptr);

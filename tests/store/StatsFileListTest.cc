@@ -75,8 +75,8 @@ TEST(StatsFileList, DebugLinesNameEachScannedDirectory) {
   statsFileList(fromOptions(dir.path(), Date{0}));
   gDebug = 0;
   setConsole(nullptr, nullptr);
-  EXPECT_EQ(e.str(), "Adding files from " + dir.path() +
-                         " recursively (periodic files newer than 1970-01-01 00:00:00 +0000)\n");
+  EXPECT_EQ(e.str(),
+            "Adding files from " + dir.path() + " recursively (periodic files newer than 1970-01-01 00:00:00 +0000)\n");
 }
 
 class Cleanup : public ::testing::Test {
@@ -132,8 +132,7 @@ TEST_F(Cleanup, SafeRemovalRefusesPathsOutsideTheManagedAreas) {
       ADD_FAILURE() << "no exception for " << path;
     } catch (const Exception& e) {
       EXPECT_EQ(e.name(), kInvalidArgumentException);
-      EXPECT_EQ(e.reason(),
-                "Attempted to delete a file that is not in a Brindlewick-managed area of the filesystem.");
+      EXPECT_EQ(e.reason(), "Attempted to delete a file that is not in a Brindlewick-managed area of the filesystem.");
     }
   }
   EXPECT_TRUE(std::filesystem::exists(outside));

@@ -81,10 +81,16 @@ TEST(BatterySummary, UnknownChargeHalvesRangesOfAtLeast60002Milliseconds) {
     }
     Ranges seen;
   } s;
-  for (const auto& [length, halves] : std::vector<std::pair<std::uint64_t, Ranges>>{
-           {60001, {}},
-           {60002, {{0, 30001}, {30001, 30001}}},
-           {120005, {{0, 60002}, {0, 30001}, {30001, 30001}, {60002, 60002}, {60002, 30001}, {90003, 30001}}}}) {  // an odd last millisecond is dropped
+  for (const auto& [length, halves] :
+       std::vector<std::pair<std::uint64_t, Ranges>>{{60001, {}},
+                                                     {60002, {{0, 30001}, {30001, 30001}}},
+                                                     {120005,
+                                                      {{0, 60002},
+                                                       {0, 30001},
+                                                       {30001, 30001},
+                                                       {60002, 60002},
+                                                       {60002, 30001},
+                                                       {90003, 30001}}}}) {  // an odd last millisecond is dropped
     s.seen.clear();
     const PowerSummary p = summarize(s, {0, length});
     Ranges expected{{0, length}};

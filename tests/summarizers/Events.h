@@ -27,19 +27,29 @@ R make(F set) {
   return r;
 }
 inline SleepWake sleepWake(std::uint32_t reason, bool fromStandby = false, const std::string& wakeType = "") {
-  return make<SleepWake>([&](SleepWake& r) { r.setReason(reason), r.setWakeFromStandby(fromStandby); if (!wakeType.empty()) r.setWakeType(wakeType); });
+  return make<SleepWake>([&](SleepWake& r) {
+    r.setReason(reason), r.setWakeFromStandby(fromStandby);
+    if (!wakeType.empty()) r.setWakeType(wakeType);
+  });
 }
 inline PowerStateChange powerChange(std::uint64_t change, bool full = false) {
   return make<PowerStateChange>([&](PowerStateChange& r) { r.setChange(change), r.setIsFullyCharged(full); });
 }
-inline UserIdle userIdle(std::uint32_t change) { return make<UserIdle>([&](UserIdle& r) { r.setChange(change); }); }
+inline UserIdle userIdle(std::uint32_t change) {
+  return make<UserIdle>([&](UserIdle& r) { r.setChange(change); });
+}
 inline DeviceChange device(std::uint32_t type, std::uint32_t on) {
   return make<DeviceChange>([&](DeviceChange& r) { r.setDeviceType(type), r.setNowConnected(on); });
 }
 // A gauge sample; a voltage of 0 leaves the voltage out.
 inline BatteryChargeLevel level(std::int64_t charge, std::int64_t maxCharge, std::int64_t mV = 0) {
-  return make<BatteryChargeLevel>([&](BatteryChargeLevel& r) { r.setCharge(charge), r.setMaxCharge(maxCharge); if (mV) r.setInstantVoltage(mV); });
+  return make<BatteryChargeLevel>([&](BatteryChargeLevel& r) {
+    r.setCharge(charge), r.setMaxCharge(maxCharge);
+    if (mV) r.setInstantVoltage(mV);
+  });
 }
-inline LogStartsV1 logStarts(std::uint8_t n) { return make<LogStartsV1>([&](LogStartsV1& r) { r.setBootUUID(boot(n)); }); }
+inline LogStartsV1 logStarts(std::uint8_t n) {
+  return make<LogStartsV1>([&](LogStartsV1& r) { r.setBootUUID(boot(n)); });
+}
 
 }  // namespace bw::test

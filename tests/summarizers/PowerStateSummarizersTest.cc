@@ -15,9 +15,15 @@ using Ranges = std::vector<Range>;
 // Every model summarizer fed the same records; ranges by key.
 class States {
  public:
-  States() { for (auto& [key, s] : makeModelSummarizers()) all[key] = std::move(s); }
-  void add(const Record& r, std::uint64_t position, std::uint8_t bootNumber = 1) { for (auto& [key, s] : all) test::feed(*s, r, position, bootNumber); }
-  void finish(std::uint64_t last) { for (auto& [key, s] : all) s->setLastPosition(last); }
+  States() {
+    for (auto& [key, s] : makeModelSummarizers()) all[key] = std::move(s);
+  }
+  void add(const Record& r, std::uint64_t position, std::uint8_t bootNumber = 1) {
+    for (auto& [key, s] : all) test::feed(*s, r, position, bootNumber);
+  }
+  void finish(std::uint64_t last) {
+    for (auto& [key, s] : all) s->setLastPosition(last);
+  }
   Ranges operator[](const std::string& key) const { return all.at(key)->ranges(); }
   std::map<std::string, std::unique_ptr<Summarizer>> all;
 };
@@ -49,7 +55,8 @@ TEST(PowerStates, OnlyWakeAndActiveStartAtBootAndEveryStateEndsAtShutdown) {
   EXPECT_EQ(states["Wake"], (Ranges{{10, 10}, {40, 20}}));
   EXPECT_EQ(states["Active"], (Ranges{{10, 20}, {40, 20}}));
   EXPECT_EQ(states["Sleep"], (Ranges{{20, 10}}));  // closed at boot 1's last record
-  for (const char* key : {"A/C", "Battery", "Idle", "DarkWake", "Wi-Fi", "Bluetooth", "DiscreteGraphics"}) EXPECT_TRUE(states[key].empty()) << key;
+  for (const char* key : {"A/C", "Battery", "Idle", "DarkWake", "Wi-Fi", "Bluetooth", "DiscreteGraphics"})
+    EXPECT_TRUE(states[key].empty()) << key;
 }
 
 TEST(PowerStates, PowerSourceAndUserIdleFollowTheirCodes) {
@@ -68,10 +75,13 @@ TEST(PowerStates, PowerSourceAndUserIdleFollowTheirCodes) {
 
 TEST(PowerStates, DevicesFollowTheirOwnTypeOnly) {
   States states;
-  for (auto [type, connected, position] : {std::tuple{5u, 1u, 10u}, {6u, 1u, 20u}, {5u, 0u, 30u},
+  for (auto [type, connected, position] : {std::tuple{5u, 1u, 10u},
+                                           {6u, 1u, 20u},
+                                           {5u, 0u, 30u},
                                            {5u, 0u, 40u},  // Wi-Fi already off: nothing changes
                                            {9u, 2u, 50u},  // any non-zero state turns it on
-                                           {6u, 0u, 60u}, {9u, 0u, 70u}}) {
+                                           {6u, 0u, 60u},
+                                           {9u, 0u, 70u}}) {
     states.add(test::device(type, connected), position);
   }
   states.finish(100);

@@ -18,8 +18,7 @@ struct RunSettings {
   bool asUnprivilegedUser = false;         // drop to uid/gid 65534 when running as root
 };
 
-ToolResult runBinary(const std::string& binary, const std::vector<std::string>& args,
-                     const RunSettings& settings = {});
+ToolResult runBinary(const std::string& binary, const std::vector<std::string>& args, const RunSettings& settings = {});
 ToolResult runTool(const std::vector<std::string>& args, const RunSettings& settings = {});
 
 // The usage text with the standard error of getopt's own complaint before it.

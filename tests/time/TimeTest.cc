@@ -50,7 +50,7 @@ std::string thrownText(F&& call) {
 }
 
 using Lookup = std::pair<std::uint64_t, std::optional<std::uint64_t>>;  // wall time, absolute time
-using Calls = std::vector<std::array<std::uint64_t, 3>>;                 // position, wall time, absolute time
+using Calls = std::vector<std::array<std::uint64_t, 3>>;                // position, wall time, absolute time
 
 Lookup lookup(const Timeline& t, std::uint64_t position, std::uint64_t offset) {
   auto abs = t.absoluteTimeForRelative(position, offset);
@@ -114,7 +114,6 @@ class TimeTest : public testing::Test {
   // A record at `abs` with wall time `wall` (a wake), or without one (0).
   Record* at(std::uint64_t abs, std::uint64_t wall = 0) { return wall != 0 ? wake(abs, wall) : idle(abs); }
 
-
   // A segment of (absolute time, wall time) records; wall time 0 is none.
   std::unique_ptr<AbsoluteTimeline> segment(std::initializer_list<std::pair<std::uint64_t, std::uint64_t>> samples) {
     auto s = std::make_unique<AbsoluteTimeline>(nullptr);
@@ -162,15 +161,15 @@ TEST_F(TimeTest, ASegmentTakesItsSkewFromItsStartAndAnswersOnlyWithAnOffset) {
   EXPECT_EQ(s->skew(), 5050);
   EXPECT_EQ(std::pair(s->startWallTime(), s->endWallTime()), std::pair(std::uint64_t{5150}, std::uint64_t{5200}));
   s->addObject(at(200, 5250));
-  EXPECT_EQ(thrownText([&] { s->addObject(at(300, 5300)); }),
-            "NSInternalInconsistencyException: event skew mismatch");
+  EXPECT_EQ(thrownText([&] { s->addObject(at(300, 5300)); }), "NSInternalInconsistencyException: event skew mismatch");
   // At offset 1000 (skew 5000, duration 200): a wall time at the first instant but no absolute time.
   s = segment({{100, 5100}, {300, 0}});
   const std::pair<std::uint64_t, Lookup> cases[] = {
       {999, {0, {}}}, {1000, {5100, {}}}, {1001, {5101, 101}}, {1200, {5300, 300}}, {1201, {0, {}}}};
   for (auto [position, expected] : cases) EXPECT_EQ(lookup(*s, position, 1000), expected) << position;
-  const std::tuple<std::uint64_t, std::uint64_t, std::vector<Range>> ranges[] = {  // clipped to the span
-      {0, 999, {}},           {1201, 2000, {}},           {0, 5000, {{100, 200}}},
+  const std::tuple<std::uint64_t, std::uint64_t, std::vector<Range>> ranges[] = {
+      // clipped to the span
+      {0, 999, {}},          {1201, 2000, {}},          {0, 5000, {{100, 200}}},
       {0, 1000, {{100, 0}}}, {1050, 1100, {{150, 50}}}, {1200, 1200, {{300, 0}}}};
   for (auto [from, to, expected] : ranges) EXPECT_EQ(spans(s->absoluteRangesForRelative(from, to, 1000)), expected);
   EXPECT_THROW(s->absoluteRangesForRelative(1100, 1050, 1000), Exception);
@@ -346,20 +345,29 @@ TEST_F(TimeTest, SleepsAndClockChangesStartSegmentsAndAClockSetLateMovesTheEarli
   const std::uint64_t cut = BootTimeline::kClockSetWallTime;
   EXPECT_EQ(cut, 1356998400000u);  // 2013-01-01
   const std::int64_t w = kWall, cutOff = cut;
-  const std::tuple<const char*, Records, List, std::vector<std::int64_t>> cases[] = {  // positions, skews
+  const std::tuple<const char*, Records, List, std::vector<std::int64_t>> cases[] = {
+      // positions, skews
       {"asleep for an hour: the ticks advance 50 ms, the wall clock 3,600,050",
        {header(1000, kWall), idle(5000), wake(10000, kWall + 9000), wake(10050, kWall + 3609050), idle(12050)},
-       {0, 4000, 9000, 3609050, 3611050}, {w - 1000, w + 3609050 - 10050}},
-      {"a clock set back by the ticks since: a touching segment", {header(0, kWall), idle(8000),
-       clockSet(9000, kWall + 8000), idle(9500)}, {0, 8000, 8000, 8500}, {w, w + 8000 - 9000}},
-      {"a 1970 header (skew 5000) and the clock set at tick 300", {header(100, 5100), idle(200),
-       clockSet(300, kWall)}, {0, 100, 200}, {w - 300}},
-      {"every segment before the clock was set moves by as much", {header(100, 5100), wake(200, 9200),
-       clockSet(300, kWall)}, {0, 4100, 4200}, {w - 4300, w - 300}},  // one ends at w - 4200, one starts at w - 100
+       {0, 4000, 9000, 3609050, 3611050},
+       {w - 1000, w + 3609050 - 10050}},
+      {"a clock set back by the ticks since: a touching segment",
+       {header(0, kWall), idle(8000), clockSet(9000, kWall + 8000), idle(9500)},
+       {0, 8000, 8000, 8500},
+       {w, w + 8000 - 9000}},
+      {"a 1970 header (skew 5000) and the clock set at tick 300",
+       {header(100, 5100), idle(200), clockSet(300, kWall)},
+       {0, 100, 200},
+       {w - 300}},
+      {"every segment before the clock was set moves by as much",
+       {header(100, 5100), wake(200, 9200), clockSet(300, kWall)},
+       {0, 4100, 4200},
+       {w - 4300, w - 300}},  // one ends at w - 4200, one starts at w - 100
       // The first clock after the cut-off (at tick 400) moves the first two
       // segments; the first, moved as far, still ends long before the second.
-      {"only the first clock after the cut-off moves them", {header(100, 5100), clockSet(300, cut),
-       clockSet(400, kWall), wake(500, kWall + 10000)}, {0, cut - 5100, cut - 5000, cut + 5000},
+      {"only the first clock after the cut-off moves them",
+       {header(100, 5100), clockSet(300, cut), clockSet(400, kWall), wake(500, kWall + 10000)},
+       {0, cut - 5100, cut - 5000, cut + 5000},
        {5000 + (w - 400) - (cutOff - 300), w - 400, w + 9500}}};
   for (const auto& [what, events, expectedPositions, skews] : cases) {
     BootTimeline boot(kA, events);
@@ -382,7 +390,8 @@ TEST_F(TimeTest, SleepsAndClockChangesStartSegmentsAndAClockSetLateMovesTheEarli
 }
 
 TEST_F(TimeTest, BootsApartInWallTimeKeepTheGapAndOverlappingBootsDoNot) {
-  const std::tuple<const char*, std::uint64_t, std::uint64_t> cases[] = {  // second start, its offset
+  const std::tuple<const char*, std::uint64_t, std::uint64_t> cases[] = {
+      // second start, its offset
       {"ten minutes apart", kWall + 60000 + 600000, 60000 + 600000},
       {"overlapping", kWall + 30000, 60000},
       {"back to back", kWall + 60000, 60000}};
@@ -395,13 +404,19 @@ TEST_F(TimeTest, BootsApartInWallTimeKeepTheGapAndOverlappingBootsDoNot) {
     timeline->enumerateTimelinesWithOffset(0, [&](auto&, std::uint64_t x, bool&) { offsets.push_back(x); });
     EXPECT_EQ(offsets, (List{0, secondOffset})) << what;
     EXPECT_EQ(std::tuple(timeline->duration(), timeline->startWallTime(), timeline->endWallTime()),
-              std::tuple(secondOffset + 1000, kWall, secondStart + 1000)) << what;
+              std::tuple(secondOffset + 1000, kWall, secondStart + 1000))
+        << what;
   }
 }
 
 TEST_F(TimeTest, TheChainEndingLatestIsKeptPerSystemVersionAndTheOtherBootsAreListed) {
   // A boot starting `start` ms after kWall and lasting `length`.
-  struct Boot { Uuid id; std::uint64_t start, length; std::optional<Uuid> last; const char* version = "23A344"; };
+  struct Boot {
+    Uuid id;
+    std::uint64_t start, length;
+    std::optional<Uuid> last;
+    const char* version = "23A344";
+  };
   const std::tuple<const char*, std::vector<Boot>, std::string> cases[] = {
       {"A, B, C chained; D unrelated and over before C",
        {{kA, 0, 1000}, {kB, 10000, 1000, kA}, {kC, 20000, 1000, kB}, {kD, 5000, 500}},
@@ -409,24 +424,26 @@ TEST_F(TimeTest, TheChainEndingLatestIsKeptPerSystemVersionAndTheOtherBootsAreLi
       {"a lone boot ending later beats a longer chain",
        {{kA, 0, 1000}, {kB, 10000, 1000, kA}, {kC, 20000, 1000, kB}, {kD, 5000, 100000}},
        "23A344: 04\n" + warning({kA, kB, kC})},
-      {"on equal ends the longer chain wins", {{kA, 0, 1000}, {kB, 10000, 1000, kA}, {kD, 5000, 6000}},
+      {"on equal ends the longer chain wins",
+       {{kA, 0, 1000}, {kB, 10000, 1000, kA}, {kD, 5000, 6000}},
        "23A344: 01 02\n" + warning({kD})},
       {"then the lower UUID", {{kD, 0, 1000}, {kC, 0, 1000}}, "23A344: 03\n" + warning({kD})},
-      {"one chain per version", {{kA, 0, 1000}, {kB, 10000, 1000, kA, "23B74"}, {kC, 20000, 1000, kB, nullptr}},
+      {"one chain per version",
+       {{kA, 0, 1000}, {kB, 10000, 1000, kA, "23B74"}, {kC, 20000, 1000, kB, nullptr}},
        "23A344: 01\n23B74: 02\n<unknown>: 03\n"}};
   for (const auto& [what, boots, expected] : cases) {
     boots_.clear();
-    for (const Boot& b : boots)
-      boots_[b.id] = {header(0, kWall + b.start, b.version, b.last), idle(b.length)};
+    for (const Boot& b : boots) boots_[b.id] = {header(0, kWall + b.start, b.version, b.last), idle(b.length)};
     EXPECT_EQ(sequenced(), expected) << what;
   }
-  const std::vector<std::pair<Uuid, Uuid>> loops[] = {  // boot, its previous boot
-      {{kA, kB}, {kB, kA}}, {{kA, kA}}, {{kA, kB}, {kB, kC}, {kC, kB}, {kD, kA}}};
+  const std::vector<std::pair<Uuid, Uuid>> loops[] = {// boot, its previous boot
+                                                      {{kA, kB}, {kB, kA}},
+                                                      {{kA, kA}},
+                                                      {{kA, kB}, {kB, kC}, {kC, kB}, {kD, kA}}};
   for (const auto& links : loops) {
     boots_.clear();
     for (auto [id, last] : links) boots_[id] = {header(0, kWall, "23A344", last), idle(1000)};
-    EXPECT_EQ(thrownText([&] { sequenceBoots(boots_); }),
-              "NSInternalInconsistencyException: boot uuid cycle detected");
+    EXPECT_EQ(thrownText([&] { sequenceBoots(boots_); }), "NSInternalInconsistencyException: boot uuid cycle detected");
   }
 }
 
@@ -449,8 +466,15 @@ TEST_F(TimeTest, ABootIsSortedByAbsoluteTimeKeepingTiesInOrderAndBeginsWithAVers
 TEST_F(TimeTest, EveryRecordsPositionMapsBackToItsWallTimeAndAbsoluteTime) {
   // A: an hour's sleep after tick 3000, then the clock set back so that the
   // third segment touches the second. Ends at wall kWall + 3610500.
-  boots_[kA] = {header(1000, kWall), idle(2000),  idle(3000), wake(3500, kWall + 3602500), idle(4000),
-                idle(8000), clockSet(9000, kWall + 3607000), idle(9500), idle(12500)};
+  boots_[kA] = {header(1000, kWall),
+                idle(2000),
+                idle(3000),
+                wake(3500, kWall + 3602500),
+                idle(4000),
+                idle(8000),
+                clockSet(9000, kWall + 3607000),
+                idle(9500),
+                idle(12500)};
   const std::uint64_t bStart = kWall + 3610500 + 600000;  // B: ten minutes after A, with one sleep
   boots_[kB] = {header(500, bStart, "23A344", kA), idle(700), wake(800, bStart + 90300), idle(5000)};
   // C: starts on a 1970 clock that is set at tick 300.
@@ -474,18 +498,18 @@ TEST_F(TimeTest, EveryRecordsPositionMapsBackToItsWallTimeAndAbsoluteTime) {
   EXPECT_EQ(segmentSpans.size(), 6u);  // A: 3, B: 2, C: 1
   std::size_t walked = 0, absChecked = 0;
   std::uint64_t lastPosition = 0;
-  timeline.enumerateEventsUsingBlock([&](const Record& r, std::uint64_t position, std::uint64_t wall,
-                                         const AbsTime& abs, bool&) {
-    ++walked;
-    EXPECT_GE(position, lastPosition);
-    lastPosition = position;
-    EXPECT_EQ(pairOf(abs), std::pair(bootOf.at(&r), r.absoluteTime()));
-    EXPECT_TRUE(r.wallTime() <= BootTimeline::kClockSetWallTime || wall == r.wallTime()) << position;
-    EXPECT_EQ(timeline.wallTimeForRelative(position), wall) << position;
-    if (segmentStarts.count(position) == 0 && ++absChecked) {
-      EXPECT_EQ(lookup(timeline, position, 0).second, abs.time) << position;
-    }
-  });
+  timeline.enumerateEventsUsingBlock(
+      [&](const Record& r, std::uint64_t position, std::uint64_t wall, const AbsTime& abs, bool&) {
+        ++walked;
+        EXPECT_GE(position, lastPosition);
+        lastPosition = position;
+        EXPECT_EQ(pairOf(abs), std::pair(bootOf.at(&r), r.absoluteTime()));
+        EXPECT_TRUE(r.wallTime() <= BootTimeline::kClockSetWallTime || wall == r.wallTime()) << position;
+        EXPECT_EQ(timeline.wallTimeForRelative(position), wall) << position;
+        if (segmentStarts.count(position) == 0 && ++absChecked) {
+          EXPECT_EQ(lookup(timeline, position, 0).second, abs.time) << position;
+        }
+      });
   EXPECT_EQ(walked, 9u + 4u + 4u);
   EXPECT_EQ(absChecked, walked - 6 - 1);  // the touching segment's start holds two records
   std::vector<std::pair<Uuid, Range>> ranges;

@@ -30,8 +30,8 @@ struct VectorSource {
   bool perCpu;
 };
 constexpr VectorSource kVectors[] = {
-    {"timer", 180, 900, true}, {"ipi", 20, 600, true}, {"nvme0", 15, 260, false}, {"xhci0", 4, 12, false},
-    {"wlan0", 25, 140, false}, {"gpu0", 30, 400, false}, {"hda0", 2, 40, false},  {"smc0", 2, 3, false},
+    {"timer", 180, 900, true}, {"ipi", 20, 600, true},   {"nvme0", 15, 260, false}, {"xhci0", 4, 12, false},
+    {"wlan0", 25, 140, false}, {"gpu0", 30, 400, false}, {"hda0", 2, 40, false},    {"smc0", 2, 3, false},
 };
 
 std::size_t vectorSlots(int cores) {
@@ -82,7 +82,8 @@ void CpuSamples::tick(const Run& run, std::uint64_t abs, std::uint64_t dt, Count
   pkg.setPkgC0Residency(c.c0);
   pkg.setPkgCanyResidency(c.cany);
   pkg.setPkgCmaxResidency(c.cmax);
-  const double mhz = busy < 0.1 ? 800.0 : static_cast<double>(nominalMHz_) * (0.55 + 0.9 * load) * rng_.uniform(0.97, 1.03);
+  const double mhz =
+      busy < 0.1 ? 800.0 : static_cast<double>(nominalMHz_) * (0.55 + 0.9 * load) * rng_.uniform(0.97, 1.03);
   pkg.setPkgFreq(std::min<std::uint64_t>(turboMHz_, static_cast<std::uint64_t>(mhz)));
   pkg.setPkgFreqNominal(nominalMHz_);
   pkg.setMaxbusdelay(static_cast<std::uint64_t>(rng_.below(4)) * 50);
@@ -165,7 +166,9 @@ void CpuSamples::tick(const Run& run, std::uint64_t abs, std::uint64_t dt, Count
     add("PSYS", [&](SmcKey& k) { k.setU64value(static_cast<std::uint64_t>(2'500 + 21'000 * load)); });
     add("VADP", [&](SmcKey& k) { k.setS64value(onAC ? 20'100 : 0); });
     add("FNUM", [&](SmcKey& k) { k.setU64value(1); });
-    add("BSTA", [&](SmcKey& k) { k.setBvalue(std::string{static_cast<char>(onAC ? 3 : 1), static_cast<char>(busy * 255)}); });
+    add("BSTA", [&](SmcKey& k) {
+      k.setBvalue(std::string{static_cast<char>(onAC ? 3 : 1), static_cast<char>(busy * 255)});
+    });
     sink.add(Stream::Periodic, keys);
   }
 }

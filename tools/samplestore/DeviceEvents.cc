@@ -184,7 +184,8 @@ void DeviceEvents::brightness(const Boot& boot, RecordSink& sink) {
 void DeviceEvents::counters(const Boot& boot, RecordSink& sink) {
   const std::uint64_t pages = memoryBytes_ / pageSize_;
   struct {
-    std::uint64_t readOps = 0, writeOps = 0, read = 0, written = 0, packetsIn = 0, packetsOut = 0, bytesIn = 0, bytesOut = 0;
+    std::uint64_t readOps = 0, writeOps = 0, read = 0, written = 0, packetsIn = 0, packetsOut = 0, bytesIn = 0,
+                  bytesOut = 0;
     std::uint64_t faults = 0, zeroFills = 0, reactivations = 0, pageins = 0, pageouts = 0, purges = 0;
     std::uint64_t compressions = 0, decompressions = 0, swapins = 0, swapouts = 0;
     std::uint64_t psrOff = 0, psrTransit = 0, psrOn = 0, psrSleep = 0, dpbOff = 0, dpbOn = 0;

@@ -54,7 +54,8 @@ void FileLayout::writeBoot(std::size_t index, RecordSink& sink) {
     std::size_t to = from + 1;
     while (to < periodic.entries.size() && dayOf(to) == day) ++to;
     std::string name = uuid + ".periodic." + dateText(civilFromDays(day));
-    for (int n = 2; used.count(name); ++n) name = uuid + ".periodic." + dateText(civilFromDays(day)) + "." + std::to_string(n);
+    for (int n = 2; used.count(name); ++n)
+      name = uuid + ".periodic." + dateText(civilFromDays(day)) + "." + std::to_string(n);
     used.insert(name);
     writeFile(index, own + name + ".stats", kPeriodicWriter, false, periodic, from, to, sink);
     from = to;

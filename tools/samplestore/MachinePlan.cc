@@ -46,7 +46,8 @@ double hashUnit(std::uint64_t key, std::uint64_t n) {
 }
 
 const Run& Boot::runAt(std::uint64_t abs) const {
-  auto it = std::upper_bound(runs.begin(), runs.end(), abs, [](std::uint64_t a, const Run& r) { return a < r.absStart; });
+  auto it =
+      std::upper_bound(runs.begin(), runs.end(), abs, [](std::uint64_t a, const Run& r) { return a < r.absStart; });
   return it == runs.begin() ? runs.front() : *std::prev(it);
 }
 
@@ -141,8 +142,10 @@ std::vector<MachinePlan::Session> MachinePlan::planSessions(Random& rng) {
     const std::uint64_t length = s.end - s.start;
     if (length > 90 * kMinute && rng.chance(0.35)) {
       const bool restart = rng.chance(0.15);
-      const std::uint64_t mid = s.start + static_cast<std::uint64_t>(rng.uniform(0.3, 0.7) * static_cast<double>(length));
-      const auto gap = static_cast<std::uint64_t>(restart ? rng.between(45'000, 90'000) : rng.between(10 * kMinute, 40 * kMinute));
+      const std::uint64_t mid =
+          s.start + static_cast<std::uint64_t>(rng.uniform(0.3, 0.7) * static_cast<double>(length));
+      const auto gap =
+          static_cast<std::uint64_t>(restart ? rng.between(45'000, 90'000) : rng.between(10 * kMinute, 40 * kMinute));
       if (mid + gap + 15 * kMinute < s.end) {
         Session first = s;
         first.end = mid;
@@ -185,7 +188,8 @@ std::vector<MachinePlan::Episode> MachinePlan::planEpisodes(std::vector<Session>
     if (onAC) return;
     const std::int64_t length = static_cast<std::int64_t>(to - from);
     if (batteryMs + length > kBatteryLimit) {
-      const std::uint64_t at = from + static_cast<std::uint64_t>(std::max<std::int64_t>(kBatteryLimit - batteryMs, kMinute));
+      const std::uint64_t at =
+          from + static_cast<std::uint64_t>(std::max<std::int64_t>(kBatteryLimit - batteryMs, kMinute));
       if (at < to) {
         onAC = true;
         batteryMs = 0;
@@ -211,7 +215,8 @@ std::vector<MachinePlan::Episode> MachinePlan::planEpisodes(std::vector<Session>
       const std::uint64_t asleep = sessions[i - 1].end;
       std::uint64_t sleepStart = asleep;
       while (true) {
-        const std::int64_t interval = onAC ? rng.between(50 * kMinute, 110 * kMinute) : rng.between(150 * kMinute, 300 * kMinute);
+        const std::int64_t interval =
+            onAC ? rng.between(50 * kMinute, 110 * kMinute) : rng.between(150 * kMinute, 300 * kMinute);
         const std::uint64_t wake = sleepStart + static_cast<std::uint64_t>(interval);
         if (wake + 15 * kMinute > s.start || (onAC && wake - asleep > 4 * kHour)) break;
         Episode dark;
@@ -241,7 +246,8 @@ std::vector<MachinePlan::Episode> MachinePlan::planEpisodes(std::vector<Session>
     }
     const std::uint64_t length = s.end - s.start;
     if (length > 30 * kMinute && rng.chance(0.25)) {
-      const std::uint64_t change = s.start + static_cast<std::uint64_t>(rng.uniform(0.2, 0.9) * static_cast<double>(length));
+      const std::uint64_t change =
+          s.start + static_cast<std::uint64_t>(rng.uniform(0.2, 0.9) * static_cast<double>(length));
       spend(s.start, change);
       onAC = !onAC;
       if (onAC) batteryMs = 0;
@@ -298,14 +304,18 @@ void MachinePlan::planUserActivity(const Run& run, Random& rng) {
   const std::uint64_t end = run.wallEnd();
   // Before a sleep the user is idle: minutes when the display dims first,
   // a second when the lid is simply closed.
-  const std::uint64_t tail = run.end == RunEnd::Running ? 0 : static_cast<std::uint64_t>(rng.chance(0.5) ? rng.between(2 * kMinute, 6 * kMinute) : 1'000);
+  const std::uint64_t tail =
+      run.end == RunEnd::Running
+          ? 0
+          : static_cast<std::uint64_t>(rng.chance(0.5) ? rng.between(2 * kMinute, 6 * kMinute) : 1'000);
   const std::uint64_t limit = end - tail;
   std::uint64_t t = run.wallStart + static_cast<std::uint64_t>(rng.between(5 * kMinute, 40 * kMinute));
   const std::size_t first = idle_.size();
   while (t < limit) {
     t += static_cast<std::uint64_t>(rng.between(10 * kMinute, 60 * kMinute));
     if (t + kMinute >= limit) break;
-    const std::uint64_t idleEnd = std::min(limit, t + static_cast<std::uint64_t>(rng.between(3 * kMinute, 25 * kMinute)));
+    const std::uint64_t idleEnd =
+        std::min(limit, t + static_cast<std::uint64_t>(rng.between(3 * kMinute, 25 * kMinute)));
     idle_.push_back({t, idleEnd});
     t = idleEnd;
   }
@@ -317,8 +327,10 @@ void MachinePlan::planUserActivity(const Run& run, Random& rng) {
     }
   }
   if (run.duration > 40 * kMinute && rng.chance(0.35)) {
-    const std::uint64_t start = run.wallStart + static_cast<std::uint64_t>(rng.uniform(0.05, 0.7) * static_cast<double>(run.duration));
-    heavy_.push_back({start, std::min(end, start + static_cast<std::uint64_t>(rng.between(10 * kMinute, 60 * kMinute)))});
+    const std::uint64_t start =
+        run.wallStart + static_cast<std::uint64_t>(rng.uniform(0.05, 0.7) * static_cast<double>(run.duration));
+    heavy_.push_back(
+        {start, std::min(end, start + static_cast<std::uint64_t>(rng.between(10 * kMinute, 60 * kMinute)))});
   }
 }
 

@@ -31,9 +31,9 @@ struct Run {
   bool dark = false;            // a maintenance wake: display off, no user
   RunStart start = RunStart::Boot;
   RunEnd end = RunEnd::Sleep;
-  bool fromStandby = false;    // the wake that began the run left standby
-  const char* wakeType = "";   // what woke the machine
-  std::uint64_t sleptMs = 0;   // wall time asleep before the wake
+  bool fromStandby = false;   // the wake that began the run left standby
+  const char* wakeType = "";  // what woke the machine
+  std::uint64_t sleptMs = 0;  // wall time asleep before the wake
 
   std::uint64_t absEnd() const { return absStart + duration; }
   std::uint64_t wallEnd() const { return wallStart + duration; }
@@ -47,8 +47,8 @@ struct Boot {
   Uuid lastUuid;  // the boot before (for the first boot, one no longer kept)
   std::string systemVersion;
   std::string lastSystemVersion;
-  bool afterUpdate = false;            // the first boot of a new system version
-  std::uint64_t firstRecordAbs = 0;    // when the system starts writing
+  bool afterUpdate = false;          // the first boot of a new system version
+  std::uint64_t firstRecordAbs = 0;  // when the system starts writing
   std::vector<Run> runs;
 
   // The run holding `abs`: the last one that starts at or before it.

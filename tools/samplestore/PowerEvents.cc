@@ -99,7 +99,8 @@ void PowerEvents::wake(const Run& run, RecordSink& sink) {
     w.setGraphicsReadyMsec(static_cast<std::uint64_t>(rng_.between(300, 1'200)));
   }
   w.setRecordWriteAbsoluteTime(run.absStart + static_cast<std::uint64_t>(rng_.between(1'500, 6'000)));
-  w.setXcpmDeepIdleStats("deep_idle=" + std::to_string(run.sleptMs / 1000) + " aborts=" + std::to_string(rng_.below(3)));
+  w.setXcpmDeepIdleStats("deep_idle=" + std::to_string(run.sleptMs / 1000) +
+                         " aborts=" + std::to_string(rng_.below(3)));
   sink.add(Stream::Power, w);
 
   // What changed while the machine slept: the zone, the date, the user.

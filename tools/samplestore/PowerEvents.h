@@ -24,7 +24,7 @@ class PowerEvents {
     double charge = 0;     // mAh
     double maxCharge = 0;  // mAh, fades a little with every cycle
     std::int64_t cycles = 0;
-    double drained = 0;    // mAh discharged since the last cycle was counted
+    double drained = 0;  // mAh discharged since the last cycle was counted
     bool full = false;
     std::uint64_t unpluggedAt = 0;  // wall time the battery began to discharge
     double smoothedMinutes = 0;
@@ -45,10 +45,10 @@ class PowerEvents {
   const MachinePlan& plan_;
   Random rng_;
   Battery battery_;
-  std::uint64_t lastWall_ = 0;      // how far the battery has been simulated
-  std::int64_t lastDay_ = 0;        // the local day last announced
-  std::size_t nextSwitch_ = 0;      // the next zone switch to announce
-  bool fullAnnounced_ = false;      // the current full charge was reported
+  std::uint64_t lastWall_ = 0;  // how far the battery has been simulated
+  std::int64_t lastDay_ = 0;    // the local day last announced
+  std::size_t nextSwitch_ = 0;  // the next zone switch to announce
+  bool fullAnnounced_ = false;  // the current full charge was reported
 };
 
 }  // namespace bw::samplestore

@@ -10,15 +10,15 @@ namespace bw::samplestore {
 namespace {
 
 const char* const kDaemonWords[] = {
-    "power", "index", "sync",  "backup", "net",     "log",    "media",   "print", "update", "time",
+    "power", "index", "sync",   "backup",   "net",    "log",    "media", "print", "update",  "time",
     "audio", "hid",   "locate", "keystore", "notify", "config", "disk",  "cache", "thermal", "usb",
-    "wlan",  "blue",  "crash", "font",   "mount",   "secure", "trust",   "usage", "report", "install",
+    "wlan",  "blue",  "crash",  "font",     "mount",  "secure", "trust", "usage", "report",  "install",
 };
 const char* const kDaemonEndings[] = {"d", "helper", "monitor"};
 
 const char* const kAgentWords[] = {
-    "cloud", "photo", "contacts", "alarm", "mail",  "share", "notes", "music",
-    "widget", "dock", "menu",    "desktop", "preview", "input", "speech", "accounts",
+    "cloud",  "photo", "contacts", "alarm",   "mail",    "share", "notes",  "music",
+    "widget", "dock",  "menu",     "desktop", "preview", "input", "speech", "accounts",
 };
 
 struct AppModel {
@@ -54,8 +54,8 @@ struct ServiceModel {
   bool numberSuffix;
 };
 const ServiceModel kServices[] = {
-    {"Renderer", 0.8, true, false},   {"Networking", 0.2, false, false}, {"Thumbnailer", 0.3, false, true},
-    {"Autosave", 0.05, false, true},  {"Spellcheck", 0.05, false, false}, {"Decoder", 0.5, true, false},
+    {"Renderer", 0.8, true, false},  {"Networking", 0.2, false, false},  {"Thumbnailer", 0.3, false, true},
+    {"Autosave", 0.05, false, true}, {"Spellcheck", 0.05, false, false}, {"Decoder", 0.5, true, false},
 };
 
 const char* const kPluginKinds[] = {"Video Decoder", "Audio Codec", "Document Viewer", "Web Content"};
@@ -174,8 +174,9 @@ std::vector<Program> makeCatalog(int scale, Random& rng) {
 }
 
 const std::vector<const char*>& toolNames() {
-  static const std::vector<const char*> names = {"sh", "cp", "tar", "zip", "df", "ps", "sort", "date",
-                                                 "logger", "stat", "sysreport", "fetchmeta", "diskcheck", "plistconv"};
+  static const std::vector<const char*> names = {"sh",        "cp",        "tar",       "zip",      "df",
+                                                 "ps",        "sort",      "date",      "logger",   "stat",
+                                                 "sysreport", "fetchmeta", "diskcheck", "plistconv"};
   return names;
 }
 

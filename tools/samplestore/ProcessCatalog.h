@@ -24,13 +24,13 @@ struct Program {
   std::string name;         // the process name (services get an instance suffix)
   std::string displayName;  // applications and plug-ins
   Role role = Role::Daemon;
-  int owner = -1;           // services and plug-ins: the program they work for
+  int owner = -1;  // services and plug-ins: the program they work for
   std::uint32_t uid = 0;
-  double cpuWeight = 0;     // share of one processor at full load
-  double wakeRate = 0;      // idle wake-ups per second
+  double cpuWeight = 0;  // share of one processor at full load
+  double wakeRate = 0;   // idle wake-ups per second
   std::uint64_t residentMB = 0;
-  bool gui = false;         // uses graphics memory
-  bool uuidSuffix = false;  // each instance's name ends in a fresh UUID
+  bool gui = false;           // uses graphics memory
+  bool uuidSuffix = false;    // each instance's name ends in a fresh UUID
   bool numberSuffix = false;  // each instance's name ends in a number
   std::array<std::uint8_t, 16> executableUuid{};
 };

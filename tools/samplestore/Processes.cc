@@ -100,7 +100,8 @@ void Processes::planInstances(const Boot& boot) {
           p.end = t + static_cast<std::uint64_t>(rng_.between(30 * kMinute, 10 * kHour));
           byProgram[i].push_back(add(std::move(p)));
           if (instances_.back().end >= last) break;
-          t = userStart(boot, instances_.back().end + static_cast<std::uint64_t>(rng_.between(20 * kMinute, 6 * kHour)));
+          t = userStart(boot,
+                        instances_.back().end + static_cast<std::uint64_t>(rng_.between(20 * kMinute, 6 * kHour)));
         }
         break;
       }
@@ -277,7 +278,8 @@ void Processes::emit(const Instance& p, std::uint64_t abs, std::int64_t status, 
     r.setInterruptWkups(static_cast<std::uint64_t>(p.interruptWakeups));
     r.setPageins(static_cast<std::uint64_t>(p.pageins));
     const double swing = 0.85 + 0.3 * hashUnit(p.uniqueid, abs / kSampleEvery);
-    const auto resident = static_cast<std::uint64_t>(static_cast<double>(p.residentMB << 20) * swing) & ~std::uint64_t{4095};
+    const auto resident =
+        static_cast<std::uint64_t>(static_cast<double>(p.residentMB << 20) * swing) & ~std::uint64_t{4095};
     r.setWiredSize(resident / 64 & ~std::uint64_t{4095});
     r.setResidentSize(resident);
     r.setPhysFootprint(resident / 5 * 4);
@@ -352,7 +354,8 @@ void Processes::boot(std::size_t index, RecordSink& sink) {
     const Run& run = boot.runs[r];
     if (!run.dark && run.end == RunEnd::Sleep) moments.push_back({run.absEnd() - 1'500, kSnapshot, r});
     const std::uint64_t first = run.start == RunStart::Boot ? boot.firstRecordAbs : run.absStart;
-    for (std::uint64_t abs = first + 45'000; abs < run.absEnd(); abs += kSampleEvery) moments.push_back({abs, kSample, r});
+    for (std::uint64_t abs = first + 45'000; abs < run.absEnd(); abs += kSampleEvery)
+      moments.push_back({abs, kSample, r});
   }
   std::sort(moments.begin(), moments.end(), [](const Moment& a, const Moment& b) {
     return a.abs != b.abs ? a.abs < b.abs : a.kind != b.kind ? a.kind < b.kind : a.index < b.index;

@@ -33,7 +33,7 @@ class Processes {
   static constexpr int kUserLaunchd = 1;
 
   struct Instance {
-    int program = -1;        // catalog index; -1 for launchd and tools
+    int program = -1;  // catalog index; -1 for launchd and tools
     std::string name;
     std::string displayName;
     std::array<std::uint8_t, 16> executableUuid{};
@@ -41,16 +41,16 @@ class Processes {
     std::uint64_t start = 0;
     std::uint64_t end = kNever;
     std::int64_t exitStatus = 0;
-    int parent = kLaunchd;   // instance index
-    int responsible = -1;    // instance index; -1 for itself
+    int parent = kLaunchd;  // instance index
+    int responsible = -1;   // instance index; -1 for itself
     std::uint64_t pid = 0;
     std::uint64_t uniqueid = 0;
     double cpuWeight = 0;
     double wakeRate = 0;
     std::uint64_t residentMB = 0;
     bool gui = false;
-    bool sampled = true;     // tools that live for a moment are only seen at exit
-    bool system = true;      // recorded by the system's launchd
+    bool sampled = true;  // tools that live for a moment are only seen at exit
+    bool system = true;   // recorded by the system's launchd
     // running totals
     std::uint64_t lastAbs = 0;
     double userNs = 0, systemNs = 0, idleWakeups = 0, interruptWakeups = 0, pageins = 0;

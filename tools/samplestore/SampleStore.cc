@@ -18,7 +18,9 @@ StoreConfig largePreset() {
   return config;
 }
 
-std::uint64_t StoreReport::totalRecords() const { return std::accumulate(records.begin(), records.end(), std::uint64_t{0}); }
+std::uint64_t StoreReport::totalRecords() const {
+  return std::accumulate(records.begin(), records.end(), std::uint64_t{0});
+}
 
 std::uint64_t StoreReport::totalBytes() const {
   std::uint64_t sum = 0;

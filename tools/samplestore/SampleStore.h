@@ -32,8 +32,8 @@ struct BootSummary {
   Uuid lastUuid;
   std::string systemVersion;
   std::string lastSystemVersion;
-  std::size_t runs = 0;         // wakes + 1
-  std::size_t processes = 0;    // process instances
+  std::size_t runs = 0;       // wakes + 1
+  std::size_t processes = 0;  // process instances
 };
 
 struct StoreReport {

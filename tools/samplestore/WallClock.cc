@@ -7,10 +7,14 @@ namespace bw::samplestore {
 
 const std::vector<ZoneRule>& zoneTable() {
   static const std::vector<ZoneRule> zones = {
-      {"PST", "PDT", -8 * 3600, ZoneRule::kNorthAmerica}, {"MST", "MDT", -7 * 3600, ZoneRule::kNorthAmerica},
-      {"CST", "CDT", -6 * 3600, ZoneRule::kNorthAmerica}, {"EST", "EDT", -5 * 3600, ZoneRule::kNorthAmerica},
-      {"GMT", "BST", 0, ZoneRule::kEurope},               {"CET", "CEST", 3600, ZoneRule::kEurope},
-      {"IST", nullptr, 19800, ZoneRule::kNone},           {"SGT", nullptr, 8 * 3600, ZoneRule::kNone},
+      {"PST", "PDT", -8 * 3600, ZoneRule::kNorthAmerica},
+      {"MST", "MDT", -7 * 3600, ZoneRule::kNorthAmerica},
+      {"CST", "CDT", -6 * 3600, ZoneRule::kNorthAmerica},
+      {"EST", "EDT", -5 * 3600, ZoneRule::kNorthAmerica},
+      {"GMT", "BST", 0, ZoneRule::kEurope},
+      {"CET", "CEST", 3600, ZoneRule::kEurope},
+      {"IST", nullptr, 19800, ZoneRule::kNone},
+      {"SGT", nullptr, 8 * 3600, ZoneRule::kNone},
       {"JST", nullptr, 9 * 3600, ZoneRule::kNone},
   };
   return zones;
@@ -34,7 +38,8 @@ std::pair<std::uint64_t, std::uint64_t> daylightPeriod(const ZoneRule& rule, int
   const Zone standard{rule.standard, rule.gmtoff};
   const Zone daylight{rule.daylight, rule.gmtoff + 3600};
   if (rule.saving == ZoneRule::kNorthAmerica) {
-    return {wallOfLocal(sundayOf(year, 3, 2), 2 * kHour, standard), wallOfLocal(sundayOf(year, 11, 1), 2 * kHour, daylight)};
+    return {wallOfLocal(sundayOf(year, 3, 2), 2 * kHour, standard),
+            wallOfLocal(sundayOf(year, 11, 1), 2 * kHour, daylight)};
   }
   const Zone utc{"UTC", 0};
   return {wallOfLocal(sundayOf(year, 3, 0), kHour, utc), wallOfLocal(sundayOf(year, 10, 0), kHour, utc)};

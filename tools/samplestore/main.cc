@@ -47,7 +47,9 @@ int main(int argc, char** argv) {
   while ((c = getopt_long(argc, argv, "o:d:s:p:qh", longOptions, nullptr)) != -1) {
     long long value = 0;
     switch (c) {
-      case 'o': config.output = optarg; break;
+      case 'o':
+        config.output = optarg;
+        break;
       case 'd':
         if (!parseNumber(optarg, 1, 3650, value)) return usage(stderr), 64;
         days = value;
@@ -62,11 +64,21 @@ int main(int argc, char** argv) {
         break;
       case 'P':
         if (std::string(optarg) != "large") return usage(stderr), 64;
-        config = [&] { auto preset = bw::samplestore::largePreset(); preset.output = config.output; return preset; }();
+        config = [&] {
+          auto preset = bw::samplestore::largePreset();
+          preset.output = config.output;
+          return preset;
+        }();
         break;
-      case 'q': quiet = true; break;
-      case 'h': usage(stdout); return 0;
-      default: usage(stderr); return 64;
+      case 'q':
+        quiet = true;
+        break;
+      case 'h':
+        usage(stdout);
+        return 0;
+      default:
+        usage(stderr);
+        return 64;
     }
   }
   if (optind != argc || config.output.empty()) return usage(stderr), 64;
