@@ -4,16 +4,13 @@
 #include <benchmark/benchmark.h>
 
 #include "LargeStore.h"
-#include "cli/Options.h"
 #include "store/RecordReader.h"
 
 namespace {
 
 std::size_t storeRecordCount() {
   static std::size_t count = [] {
-    bw::Options options;
-    options.setFrom_path(bw::bench::largeStore());
-    bw::RecordsByBoot read = bw::readAllRecords(options);
+    bw::RecordsByBoot read = bw::readAllRecords(bw::StoreQuery{.fromPath = bw::bench::largeStore()});
     std::size_t n = 0;
     for (const auto& [boot, records] : read.boots) n += records.size();
     return n;

@@ -24,7 +24,6 @@
 #include <vector>
 
 #include "brindlewick.pb.h"
-#include "cli/Options.h"
 #include "store/MappedFile.h"
 #include "store/RecordReader.h"
 
@@ -80,7 +79,7 @@ std::size_t countRecords(const bw::RecordsByBoot& r) {
 
 // Our reader, records kept by boot as the tool keeps them.
 std::size_t decodeWithReader(bw::RecordsByBoot& out) {
-  out = bw::readStatsFiles(store().paths, bw::Options());
+  out = bw::readStatsFiles(store().paths, bw::StoreQuery());
   return countRecords(out);
 }
 

@@ -11,7 +11,6 @@
 #include <fstream>
 #include <string>
 
-#include "cli/Options.h"
 #include "store/StatsFileList.h"
 
 namespace {
@@ -39,12 +38,10 @@ const std::string& tree() {
 }
 
 void BM_FileListFromTree(benchmark::State& state) {
-  bw::Options options;
-  options.setFrom_path(tree());
-  options.setLoad_periodic_files_newer_than(bw::Date::distantPast());
+  const bw::StoreQuery query{.fromPath = tree(), .periodicCutoff = bw::Date::distantPast()};
   std::size_t found = 0;
   for (auto _ : state) {
-    found = bw::statsFileList(options).size();
+    found = bw::statsFileList(query).size();
     benchmark::DoNotOptimize(found);
   }
   state.counters["files"] = static_cast<double>(found);

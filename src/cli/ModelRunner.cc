@@ -1,5 +1,6 @@
 #include "cli/ModelRunner.h"
 
+#include "cli/ModelLoader.h"
 #include "cli/Options.h"
 #include "domains/Domain.h"
 #include "domains/PostInstallDomain.h"
@@ -10,15 +11,15 @@ namespace bw {
 
 void runPerModel(const Options& options, const ModelAction& action) {
   const std::vector<std::string> maskStates = options.domain_mask_states().value_or(std::vector<std::string>{});
-  for (const std::unique_ptr<Model>& model : Model::modelsWithOptions(options, false)) {
-    std::unique_ptr<Domain> domain = Domain::domainWithOptions(options);
+  for (const std::unique_ptr<Model>& model : loadModels(options)) {
+    std::unique_ptr<Domain> domain = Domain::domainWithSpec(domainSpec(options));
     std::unique_ptr<PostInstallDomain> postInstall;
     std::vector<Summarizer*> domains{domain.get()};
     if (options.exclude_post_install()) {
       postInstall = std::make_unique<PostInstallDomain>();
       domains.push_back(postInstall.get());
     }
-    model->processEventsWithDomains(domains, options);
+    model->processEventsWithDomains(domains, feedsSummarizers(options));
 
     if (domain->ranges().empty()) continue;
     std::optional<std::vector<Range>> ranges = model->rangesForSubstates(maskStates, domain->ranges());

@@ -8,6 +8,7 @@
 
 #include "base/Date.h"
 #include "base/Uuid.h"
+#include "domains/DomainSpec.h"
 
 namespace bw {
 
@@ -23,14 +24,6 @@ enum Mode : std::uint32_t {
   kModeHelp = 7,  // never stored: usage is printed at once
   kModeDaily = 8,
   kModeServiceDebug = 9,
-};
-
-// The sample-range kinds (`domain_type`).
-enum DomainType : std::uint32_t {
-  kDomainAll = 0,
-  kDomainDate = 1,
-  kDomainWallTime = 2,  // bounds are wall-clock milliseconds since 1970
-  kDomainRelative = 3,  // bounds are timeline positions in milliseconds
 };
 
 class Options {

@@ -9,6 +9,7 @@
 #include "Records/PowerStateChange.h"
 #include "Records/SleepWake.h"
 #include "base/Console.h"
+#include "cli/ModelLoader.h"
 #include "cli/ModelRunner.h"
 #include "cli/Options.h"
 #include "domains/Domain.h"
@@ -20,9 +21,9 @@ namespace bw {
 
 void runRecordDump(const Options& options) {
   std::ostream& o = out();
-  for (const std::unique_ptr<Model>& model : Model::modelsWithOptions(options, false)) {
-    std::unique_ptr<Domain> domain = Domain::domainWithOptions(options);
-    model->processEventsWithDomains({domain.get()}, options);
+  for (const std::unique_ptr<Model>& model : loadModels(options)) {
+    std::unique_ptr<Domain> domain = Domain::domainWithSpec(domainSpec(options));
+    model->processEventsWithDomains({domain.get()}, feedsSummarizers(options));
     if (domain->ranges().empty()) continue;
     std::optional<Uuid> shownBoot;  // starts afresh for every model
     model->timeline().enumerateEventsInRelativeRanges(

@@ -4,21 +4,21 @@
 
 #include "base/Console.h"
 #include "base/Exception.h"
+#include "cli/ModelLoader.h"
 #include "cli/OptionParser.h"
 #include "cli/Options.h"
 #include "cli/RecordModes.h"
-#include "store/StatsFileList.h"
 
 namespace bw {
 
 namespace {
 
-void listFiles(const Options& parsed) {
-  Options options = parsed;
-  options.setLoad_periodic_files_newer_than(Date::distantPast());
+void listFiles(const Options& options) {
+  StoreQuery query = storeQuery(options);
+  query.periodicCutoff = Date::distantPast();
   const char separator = options.listfileswithnull() ? '\0' : '\n';
   std::ostream& o = out();
-  for (const std::string& path : statsFileList(options)) {
+  for (const std::string& path : runFileList(query)) {
     o << path;
     o.put(separator);
   }

@@ -1,7 +1,6 @@
 #include "domains/Domain.h"
 
 #include "base/Exception.h"
-#include "cli/Options.h"
 #include "domains/AllDomain.h"
 #include "domains/DateDomain.h"
 #include "domains/RelativeTimeDomain.h"
@@ -9,22 +8,18 @@
 
 namespace bw {
 
-std::unique_ptr<Domain> Domain::domainWithOptions(const Options& options) {
-  switch (options.domain_type()) {
+std::unique_ptr<Domain> Domain::domainWithSpec(const DomainSpec& spec) {
+  switch (spec.type) {
     case kDomainAll:
       return std::make_unique<AllDomain>();
-    case kDomainDate: {
-      YearMonthDay day{static_cast<std::int32_t>(options.domain_ymd_year()),
-                       static_cast<std::int32_t>(options.domain_ymd_month()),
-                       static_cast<std::int32_t>(options.domain_ymd_day())};
-      return std::make_unique<DateDomain>(day);
-    }
+    case kDomainDate:
+      return std::make_unique<DateDomain>(spec.day);
     case kDomainWallTime:
-      return std::make_unique<WallTimeDomain>(options.domain_start(), options.domain_end());
+      return std::make_unique<WallTimeDomain>(spec.start, spec.end);
     case kDomainRelative:
-      return std::make_unique<RelativeTimeDomain>(options.domain_start(), options.domain_end());
+      return std::make_unique<RelativeTimeDomain>(spec.start, spec.end);
     default:
-      terminateUnsupported("Domain::domainWithOptions: unknown domain type");
+      terminateUnsupported("Domain::domainWithSpec: unknown domain type");
   }
 }
 

@@ -7,18 +7,17 @@
 #include <cstdint>
 #include <memory>
 
-#include "model/Summarizer.h"
+#include "domains/DomainSpec.h"
+#include "framework/Summarizer.h"
 
 namespace bw {
 
-class Options;
-
 class Domain : public Summarizer {
  public:
-  // The domain the command line asks for: `domain_type` 0 everything, 1 a
-  // calendar day, 2 a wall-clock interval, 3 a span of positions. Any other
-  // value terminates the process.
-  static std::unique_ptr<Domain> domainWithOptions(const Options& options);
+  // The domain a run asks for: type 0 everything, 1 a calendar day, 2 a
+  // wall-clock interval, 3 a span of positions. Any other value terminates
+  // the process.
+  static std::unique_ptr<Domain> domainWithSpec(const DomainSpec& spec);
 
   // Abstract here: every subclass has its own rule. Terminates.
   void addEvent(const Record& event, std::uint64_t position, const AbsTime& absTime, std::uint64_t wallTime) override;

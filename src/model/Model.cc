@@ -3,7 +3,6 @@
 #include <algorithm>
 
 #include "base/Exception.h"
-#include "cli/Options.h"
 #include "store/RecordPool.h"
 #include "summarizers/ModelSummarizers.h"
 #include "summarizers/PowerSummary.h"
@@ -17,8 +16,7 @@ Model::Model(std::unique_ptr<Timeline> timeline, std::string systemVersion)
 
 Model::~Model() = default;
 
-void Model::processEventsWithDomains(const std::vector<Summarizer*>& domains, const Options& options) {
-  const bool feedSummarizers = options.mode() != kModeDump && options.mode() != kModeShowEvents;
+void Model::processEventsWithDomains(const std::vector<Summarizer*>& domains, bool feedSummarizers) {
   std::vector<Summarizer*> all;
   if (feedSummarizers) {
     for (auto& [key, summarizer] : summarizers_) all.push_back(summarizer.get());
@@ -81,14 +79,14 @@ std::optional<std::vector<Range>> Model::rangesForSubstates(const std::vector<st
 std::unique_ptr<Summary> Model::summarize(const std::string& key, const Range& range) const {
   Summarizer* s = summarizer(key);
   std::unique_ptr<Summary> summary = s->newSummary();
-  s->summarize(*summary, range, *this);
+  s->summarize(*summary, range, *timeline_);
   return summary;
 }
 
 std::unique_ptr<Summary> Model::summarize(const std::string& key, const std::vector<Range>& ranges) const {
   Summarizer* s = summarizer(key);
   std::unique_ptr<Summary> summary = s->newSummary();
-  for (const Range& r : ranges) s->summarize(*summary, r, *this);
+  for (const Range& r : ranges) s->summarize(*summary, r, *timeline_);
   return summary;
 }
 
@@ -102,7 +100,7 @@ std::vector<std::unique_ptr<Summary>> Model::summarizeTop(const std::string& key
       const Range overlap = intersectionRange(r, state);
       if (overlap.length == 0) continue;
       std::unique_ptr<Summary> summary = s->newSummary();
-      s->summarize(*summary, overlap, *this);
+      s->summarize(*summary, overlap, *timeline_);
       if (!filter(*summary)) continue;
       // Binary-search insertion under the reversed comparator: greatest first,
       // at an equal element's position when there is one.

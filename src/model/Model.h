@@ -12,12 +12,11 @@
 #include <vector>
 
 #include "base/Range.h"
-#include "model/Summarizer.h"
+#include "framework/Summarizer.h"
 #include "time/Timeline.h"
 
 namespace bw {
 
-class Options;
 class RecordPool;
 
 class Model {
@@ -27,19 +26,13 @@ class Model {
   Model(const Model&) = delete;
   Model& operator=(const Model&) = delete;
 
-  // Reads the store the options select and builds one model per system
-  // version. With `processEvents`, each model is fed with the options'
-  // domain and kept only when the domain's ranges, narrowed to the options'
-  // mask states, are not empty.
-  static std::vector<std::unique_ptr<Model>> modelsWithOptions(const Options& options, bool processEvents);
-
   const std::string& systemVersion() const { return systemVersion_; }
   const Timeline& timeline() const { return *timeline_; }
 
-  // Feeds every record in timeline order to every summarizer (except in the
-  // dump and event-listing modes) and then to every domain, then tells each
-  // the last position.
-  void processEventsWithDomains(const std::vector<Summarizer*>& domains, const Options& options);
+  // Feeds every record in timeline order to every summarizer (when
+  // `feedSummarizers`; the record listings need only the domains) and then
+  // to every domain, then tells each the last position.
+  void processEventsWithDomains(const std::vector<Summarizer*>& domains, bool feedSummarizers);
 
   // The summarizer under `key`, or null.
   Summarizer* summarizer(const std::string& key) const;

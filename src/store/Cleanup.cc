@@ -6,7 +6,6 @@
 #include "base/Exception.h"
 #include "base/Platform.h"
 #include "store/StatsFileList.h"
-#include "time/Calendar.h"
 
 namespace bw {
 
@@ -39,18 +38,12 @@ void safelyRemove(const std::string& path) {
   unlink(path.c_str());
 }
 
-void removeOldStatsFiles() {
+void removeOldStatsFiles(Date horizon) {
   std::optional<Uuid> boot = platform().currentBootUuid();
   if (!boot) return;
   const std::string bootText = boot->string();
 
-  Options defaults;
-  FileList files = statsFileList(defaults);
-
-  Date now{static_cast<double>(platform().nowMicroseconds()) / 1e6};
-  Date horizon = earlierMidnight(now);
-  for (int i = 0; i < 3; ++i) horizon = dateOneDayEarlier(horizon);
-
+  FileList files = statsFileList(StoreQuery{});
   for (const std::string& path : files) {
     if (path.find(bootText) != std::string::npos) continue;
     std::optional<Date> modified = modificationDate(path);

@@ -110,13 +110,13 @@ Uuid bootOf(const Record* header) { return asHeader(header).bootUUID().value_or(
 
 }  // namespace
 
-FileRecords readStatsFile(const std::string& path, const Options& options, RecordPool& pool) {
+FileRecords readStatsFile(const std::string& path, const StoreQuery& query, RecordPool& pool) {
   MappedFile file(path);
   if (!file.ok()) return FileRecords();
-  return readStatsData(file.data(), file.size(), path, options, pool);
+  return readStatsData(file.data(), file.size(), path, query, pool);
 }
 
-FileRecords readStatsData(const std::uint8_t* data, std::size_t size, const std::string& path, const Options& options,
+FileRecords readStatsData(const std::uint8_t* data, std::size_t size, const std::string& path, const StoreQuery& query,
                           RecordPool& pool) {
   FileRecords result;
   const RecordPool::Mark fileStart = pool.mark();
@@ -156,12 +156,12 @@ FileRecords readStatsData(const std::uint8_t* data, std::size_t size, const std:
 
       if (type == kLogStartsV1Type) {
         const LogStartsV1& header = asHeader(record);
-        if (options.only_boot_uuid() && header.bootUUID() != options.only_boot_uuid()) {
-          return drop("Skipping (Boot UUID <" + options.only_boot_uuid()->string() + ">): " + path);
+        if (query.onlyBoot && header.bootUUID() != query.onlyBoot) {
+          return drop("Skipping (Boot UUID <" + query.onlyBoot->string() + ">): " + path);
         }
-        if (options.only_system_version() &&
-            (!header.hasSystemVersion() || header.systemVersion() != *options.only_system_version())) {
-          return drop("Skipping (System Version <" + *options.only_system_version() + ">): " + path);
+        if (query.onlySystemVersion &&
+            (!header.hasSystemVersion() || header.systemVersion() != *query.onlySystemVersion)) {
+          return drop("Skipping (System Version <" + *query.onlySystemVersion + ">): " + path);
         }
         headerTime = kUnsetTime;
       }
@@ -235,23 +235,23 @@ class BootGrouper {
 
 }  // namespace
 
-RecordsByBoot readStatsFiles(const std::vector<std::string>& paths, const Options& options) {
+RecordsByBoot readStatsFiles(const std::vector<std::string>& paths, const StoreQuery& query) {
   BootGrouper grouper;
-  for (const std::string& path : paths) grouper.add(readStatsFile(path, options, grouper.pool()));
+  for (const std::string& path : paths) grouper.add(readStatsFile(path, query, grouper.pool()));
   return grouper.finish();
 }
 
-RecordsByBoot readStatsBuffers(const std::vector<StatsBuffer>& files, const Options& options) {
+RecordsByBoot readStatsBuffers(const std::vector<StatsBuffer>& files, const StoreQuery& query) {
   BootGrouper grouper;
   for (const StatsBuffer& f : files) {
-    grouper.add(readStatsData(f.data, f.size, f.name, options, grouper.pool()));
+    grouper.add(readStatsData(f.data, f.size, f.name, query, grouper.pool()));
   }
   return grouper.finish();
 }
 
-RecordsByBoot readAllRecords(const Options& options) {
-  FileList files = statsFileList(options);
-  return readStatsFiles(std::vector<std::string>(files.begin(), files.end()), options);
+RecordsByBoot readAllRecords(const StoreQuery& query) {
+  const FileList files = statsFileList(query);
+  return readStatsFiles(std::vector<std::string>(files.begin(), files.end()), query);
 }
 
 }  // namespace bw

@@ -15,8 +15,8 @@
 #include <vector>
 
 #include "base/Uuid.h"
-#include "cli/Options.h"
 #include "store/RecordPool.h"
+#include "store/StoreQuery.h"
 
 namespace bw {
 
@@ -36,22 +36,22 @@ struct FileRecords {
   bool damaged = false;          // decoding failed after the header was read
 };
 
-// Reads the file list of `options` (which may end the run for an empty
-// `--from` directory) in ascending path order. Raises "duplicate boot uuid
-// detected" when a boot has two files written by writer 5.
-RecordsByBoot readAllRecords(const Options& options);
-
 // Reads one file into `pool`, applying the per-file rules. A file that
 // cannot be opened contributes nothing.
-FileRecords readStatsFile(const std::string& path, const Options& options, RecordPool& pool);
+FileRecords readStatsFile(const std::string& path, const StoreQuery& query, RecordPool& pool);
 
 // The same over a file's bytes already in memory; `name` stands for the path
 // in the messages. The records do not point into `data`.
-FileRecords readStatsData(const std::uint8_t* data, std::size_t size, const std::string& name, const Options& options,
+FileRecords readStatsData(const std::uint8_t* data, std::size_t size, const std::string& name, const StoreQuery& query,
                           RecordPool& pool);
 
-// Reads the given files, in the given order, and groups them by boot.
-RecordsByBoot readStatsFiles(const std::vector<std::string>& paths, const Options& options);
+// Reads the given files, in the given order, and groups them by boot. Raises
+// "duplicate boot uuid detected" when a boot has two files written by
+// writer 5.
+RecordsByBoot readStatsFiles(const std::vector<std::string>& paths, const StoreQuery& query);
+
+// Reads the query's file list (an empty store gives no boots).
+RecordsByBoot readAllRecords(const StoreQuery& query);
 
 // The bytes of one file in memory, and the name its messages use.
 struct StatsBuffer {
@@ -62,6 +62,6 @@ struct StatsBuffer {
 
 // Reads in-memory files, in the given order, and groups them by boot exactly
 // as readStatsFiles does.
-RecordsByBoot readStatsBuffers(const std::vector<StatsBuffer>& files, const Options& options);
+RecordsByBoot readStatsBuffers(const std::vector<StatsBuffer>& files, const StoreQuery& query);
 
 }  // namespace bw

@@ -80,12 +80,11 @@ void scanDirectory(FileList& files, const std::string& directory, bool recursive
   }
 }
 
-FileList statsFileList(const Options& options) {
+FileList statsFileList(const StoreQuery& query) {
   FileList files;
-  const std::optional<Date>& cutoff = options.load_periodic_files_newer_than();
-  if (options.from_path()) {
-    scanDirectory(files, *options.from_path(), true, cutoff);
-    if (files.empty()) exitWithMessage(66, "--from path contained no Brindlewick trace files.");
+  const std::optional<Date>& cutoff = query.periodicCutoff;
+  if (query.fromPath) {
+    scanDirectory(files, *query.fromPath, true, cutoff);
     return files;
   }
   Platform& p = platform();

@@ -5,22 +5,22 @@
 //
 // Files named "*.stats" are taken; those with "periodic" anywhere in the name
 // are rewritten all day, so they are taken only when modified strictly after
-// the options' cutoff. Paths come out once each, in ascending byte order, so
+// the query's cutoff. Paths come out once each, in ascending byte order, so
 // that every run reads and lists them the same way.
 #include <optional>
 #include <set>
 #include <string>
 
 #include "base/Date.h"
-#include "cli/Options.h"
+#include "store/StoreQuery.h"
 
 namespace bw {
 
 using FileList = std::set<std::string>;
 
-// The file list for a run. A `--from` directory without stats files ends the
-// run with "--from path contained no Brindlewick trace files." (status 66).
-FileList statsFileList(const Options& options);
+// The file list for a run; empty when the store has no stats files (the
+// command line tells the user when a `--from` directory held none).
+FileList statsFileList(const StoreQuery& query);
 
 // Adds the matching files of `directory` to `files`. Recursive scans match
 // each entry's path relative to `directory` (files and directories alike); a

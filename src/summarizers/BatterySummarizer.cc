@@ -82,7 +82,7 @@ int BatterySummarizer::compareAveragePower(const Summary& a, const Summary& b) {
   return compareWithTolerance(averagePower(b), averagePower(a));
 }
 
-void BatterySummarizer::summarize(Summary& summary, const Range& range, const Model&) {
+void BatterySummarizer::summarize(Summary& summary, const Range& range, const Timeline&) {
   summarizePositions(dynamic_cast<PowerSummary&>(summary), range);
 }
 

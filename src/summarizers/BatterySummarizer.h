@@ -14,7 +14,7 @@
 
 #include "accum/Interpolator.h"
 #include "base/Uuid.h"
-#include "model/Summarizer.h"
+#include "framework/Summarizer.h"
 #include "summarizers/PowerSummary.h"
 
 namespace bw {
@@ -36,7 +36,7 @@ class BatterySummarizer : public Summarizer {
   static int compareAveragePower(const Summary& a, const Summary& b);
 
   // Adds the position range's contribution; `model` is not consulted.
-  void summarize(Summary& summary, const Range& range, const Model& model) override;
+  void summarize(Summary& summary, const Range& range, const Timeline& timeline) override;
   // The same without a model. A range whose charge is unknown at an end is
   // halved (an odd last millisecond dropped) and each half summarized
   // through here again while it is at least kMinSplitLength long. Charging

@@ -6,7 +6,7 @@
 #include <utility>
 #include <vector>
 
-#include "model/Summarizer.h"
+#include "framework/Summarizer.h"
 
 namespace bw {
 

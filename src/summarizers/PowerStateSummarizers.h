@@ -19,7 +19,7 @@
 //   Wi-Fi            DeviceChange      deviceType 5        -> nowConnected, else -1
 //   Bluetooth        DeviceChange      deviceType 6        -> nowConnected, else -1
 //   DiscreteGraphics DeviceChange      deviceType 9        -> nowConnected, else -1
-#include "model/Summarizer.h"
+#include "framework/Summarizer.h"
 
 namespace bw {
 

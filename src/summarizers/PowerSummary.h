@@ -5,7 +5,7 @@
 // denominator (seconds) so that summaries of several ranges add up.
 #include <limits>
 
-#include "model/Summary.h"
+#include "framework/Summary.h"
 
 namespace bw {
 

@@ -41,7 +41,7 @@ void StandbySummarizer::fillSSDInfo(StandbySummary& summary) const {
   summary.setSsdProductRevisionLevel(ssdProductRevisionLevel_);
 }
 
-void StandbySummarizer::summarize(Summary& summary, const Range& range, const Model&) {
+void StandbySummarizer::summarize(Summary& summary, const Range& range, const Timeline&) {
   summarize(dynamic_cast<StandbySummary&>(summary), range);
 }
 

@@ -13,8 +13,8 @@
 
 #include "accum/HashFactory.h"
 #include "accum/Ledger.h"
-#include "model/Summarizer.h"
-#include "model/Summary.h"
+#include "framework/Summarizer.h"
+#include "framework/Summary.h"
 
 namespace bw {
 
@@ -72,7 +72,7 @@ class StandbySummarizer : public Summarizer {
   std::unique_ptr<Summary> newSummary() const override;
   // Works on positions: adds the range's length to the duration and the
   // wakes in (L, L + N] to the counts. Leaves the summary's range alone.
-  void summarize(Summary& summary, const Range& range, const Model& model) override;
+  void summarize(Summary& summary, const Range& range, const Timeline& timeline) override;
   void summarize(StandbySummary& summary, const Range& range) const;
   using Summarizer::summarize;
 

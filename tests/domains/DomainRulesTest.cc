@@ -3,7 +3,6 @@
 #include <vector>
 
 #include "Support.h"
-#include "cli/Options.h"
 #include "domains/AbsoluteDomain.h"
 #include "domains/AllDomain.h"
 #include "domains/BootDomain.h"
@@ -125,24 +124,22 @@ TEST(PostInstallDomain, EndsAtTheNextBootAndTreatsAMissingPreviousVersionAsAnUpd
   EXPECT_EQ(domain.ranges(), (Ranges{{100, 3'600'000}}));
 }
 
-TEST(Domain, OptionsChooseTheDomainAndItsBounds) {
-  Options options;
-  EXPECT_NE(dynamic_cast<AllDomain*>(Domain::domainWithOptions(options).get()), nullptr);
+TEST(Domain, TheSpecChoosesTheDomainAndItsBounds) {
+  DomainSpec spec;
+  EXPECT_NE(dynamic_cast<AllDomain*>(Domain::domainWithSpec(spec).get()), nullptr);
 
-  options.setDomain_type(kDomainDate);
-  options.setDomain_ymd_year(2024);
-  options.setDomain_ymd_month(2);
-  options.setDomain_ymd_day(29);
-  auto date = Domain::domainWithOptions(options);
+  spec.type = kDomainDate;
+  spec.day = YearMonthDay{2024, 2, 29};
+  auto date = Domain::domainWithSpec(spec);
   auto* day = dynamic_cast<DateDomain*>(date.get());
   ASSERT_NE(day, nullptr);
   EXPECT_EQ(day->components(), (YearMonthDay{2024, 2, 29}));
 
-  options.setDomain_start(100);
-  options.setDomain_end(200);
+  spec.start = 100;
+  spec.end = 200;
   for (std::uint32_t type : {kDomainWallTime, kDomainRelative}) {
-    options.setDomain_type(type);
-    auto domain = Domain::domainWithOptions(options);
+    spec.type = type;
+    auto domain = Domain::domainWithSpec(spec);
     auto* relative = dynamic_cast<RelativeTimeDomain*>(domain.get());
     ASSERT_NE(relative, nullptr);
     EXPECT_EQ(dynamic_cast<WallTimeDomain*>(relative) != nullptr, type == kDomainWallTime);
@@ -154,9 +151,9 @@ TEST(Domain, OptionsChooseTheDomainAndItsBounds) {
 class BareDomain : public Domain {};
 
 TEST(DomainDeathTest, UnknownTypeAndTheAbstractEventRuleTerminate) {
-  Options options;
-  options.setDomain_type(4);
-  EXPECT_DEATH(Domain::domainWithOptions(options), "unknown domain type");
+  DomainSpec spec;
+  spec.type = 4;
+  EXPECT_DEATH(Domain::domainWithSpec(spec), "unknown domain type");
   BareDomain bare;
   EXPECT_DEATH(feed(bare, idle(), 0), "abstract");
 }

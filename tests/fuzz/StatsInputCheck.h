@@ -26,7 +26,6 @@
 #include "base/Console.h"
 #include "base/Exception.h"
 #include "base/Platform.h"
-#include "cli/Options.h"
 #include "store/RecordReader.h"
 
 namespace bw::fuzz {
@@ -110,7 +109,7 @@ inline std::string checkStatsInput(const std::uint8_t* data, std::size_t size) {
   } restore{savedDebug};
 
   const StatsBuffer file{data, size, "fuzz.stats"};
-  const Options plain;
+  const StoreQuery plain;
   RecordsByBoot once = readStatsBuffers({file}, plain);
   if (std::string p = detail::shapeProblem(once); !p.empty()) return p;
   if (once.boots.size() > 1) return "one file filed under two boots";
@@ -135,9 +134,9 @@ inline std::string checkStatsInput(const std::uint8_t* data, std::size_t size) {
     if (header.writer() != 5 || e.reason() != "duplicate boot uuid detected") throw;
   }
 
-  Options filtered;
-  filtered.setOnly_boot_uuid(boot);
-  if (header.hasSystemVersion()) filtered.setOnly_system_version(header.systemVersion());
+  StoreQuery filtered;
+  filtered.onlyBoot = boot;
+  if (header.hasSystemVersion()) filtered.onlySystemVersion = header.systemVersion();
   RecordsByBoot kept = readStatsBuffers({file}, filtered);
   if (!kept.boots.empty() && (kept.boots.size() != 1 || kept.boots[boot].size() != records.size())) {
     return "the filters kept part of a file";

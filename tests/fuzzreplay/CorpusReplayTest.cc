@@ -40,7 +40,7 @@ const std::uint8_t* bytesOf(const std::string& s) { return reinterpret_cast<cons
 struct Read {
   explicit Read(const std::string& name) : bytes(contents(corpusDirectory() / name)) {
     setPlatform(&log);
-    result = readStatsBuffers({StatsBuffer{bytesOf(bytes), bytes.size(), name}}, Options());
+    result = readStatsBuffers({StatsBuffer{bytesOf(bytes), bytes.size(), name}}, StoreQuery());
     setPlatform(nullptr);
   }
   const std::vector<Record*>& onlyBoot() const { return result.boots.begin()->second; }

@@ -20,7 +20,7 @@ struct FixedRanges : Summarizer {
       return compareWithTolerance(static_cast<double>(a.duration()), static_cast<double>(b.duration()));
     };
   }
-  void summarize(Summary& summary, const Range& range, const Model&) override {
+  void summarize(Summary& summary, const Range& range, const Timeline&) override {
     summary.setDuration(summary.duration() + range.length);
     summary.setRange(range);
   }

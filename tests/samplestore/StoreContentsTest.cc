@@ -42,9 +42,7 @@ TEST(SampleStoreContents, ReaderFindsEveryRecordTheGeneratorReportsPerClass) {
     EXPECT_EQ(store.report.records[static_cast<std::size_t>(absent)], 0u) << recordClassName(absent);
   }
   EXPECT_EQ(std::count(store.report.records.begin(), store.report.records.end(), 0u), 4);
-  Options options;
-  options.setFrom_path(store.config.output);
-  EXPECT_EQ(statsFileList(options).size(), store.report.files.size());
+  EXPECT_EQ(statsFileList(StoreQuery{.fromPath = store.config.output}).size(), store.report.files.size());
 }
 
 TEST(SampleStoreContents, FilesLieInTheStoreLayoutNamedByBootAndDatedByTheirLastRecord) {
@@ -60,7 +58,7 @@ TEST(SampleStoreContents, FilesLieInTheStoreLayoutNamedByBootAndDatedByTheirLast
     EXPECT_NE(relative.find(boot.uuid.string()), std::string::npos);
     EXPECT_EQ(relative.find("periodic") != std::string::npos, f.writer == 3);
     RecordPool pool;
-    const FileRecords file = readStatsFile(f.path, Options(), pool);
+    const FileRecords file = readStatsFile(f.path, StoreQuery(), pool);
     ASSERT_FALSE(file.damaged);
     ASSERT_EQ(file.records.size(), f.records);
     const auto* header = recordCast<LogStartsV1>(file.records.front());

@@ -26,9 +26,7 @@ inline const SharedStore& sharedStore() {
     s->config = StoreConfig{
         .days = 7, .seed = 11, .scale = 30, .output = s->dir / "store"};  // a trip, a weekend and the update
     s->report = generateSampleStore(s->config);
-    Options options;
-    options.setFrom_path(s->config.output);
-    s->read = readAllRecords(options);
+    s->read = readAllRecords(StoreQuery{.fromPath = s->config.output});
     for (const BootSummary& boot : s->report.boots) {
       s->boots.push_back(s->read.boots[boot.uuid]);
       sortByAbsoluteTime(s->boots.back());

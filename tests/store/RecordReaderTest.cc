@@ -34,12 +34,12 @@ class RecordReader : public ::testing::Test {
     EXPECT_TRUE(w.writeTo(path));
     return path;
   }
-  RecordsByBoot read(const std::vector<std::string>& paths) { return readStatsFiles(paths, options); }
+  RecordsByBoot read(const std::vector<std::string>& paths) { return readStatsFiles(paths, query); }
   std::string debugText() const { return err_.str(); }
 
   test::TempDir dir;
   test::FakePlatform fake;
-  Options options;
+  StoreQuery query;
   std::ostringstream out_, err_;
 };
 
@@ -156,13 +156,13 @@ TEST_F(RecordReader, BootAndBuildFiltersDropFilesOfOtherBootsAndBuilds) {
   one.append(header(bootNamed(1), 100, "22A100"));
   two.append(header(bootNamed(2), 100, "23B200"));
   std::string p1 = write("1.stats", one), p2 = write("2.stats", two);
-  options.setOnly_boot_uuid(bootNamed(2));
+  query.onlyBoot = bootNamed(2);
   RecordsByBoot byBoot = read({p1, p2});
   EXPECT_EQ(byBoot.boots.size(), 1u);
   EXPECT_TRUE(byBoot.boots.count(bootNamed(2)));
   EXPECT_EQ(debugText(), "Skipping (Boot UUID <" + bootNamed(2).string() + ">): " + p1 + "\n");
-  options.setOnly_boot_uuid(std::nullopt);
-  options.setOnly_system_version(std::string("22A100"));
+  query.onlyBoot.reset();
+  query.onlySystemVersion = "22A100";
   RecordsByBoot byBuild = read({p1, p2});
   EXPECT_EQ(byBuild.boots.size(), 1u);
   EXPECT_TRUE(byBuild.boots.count(bootNamed(1)));
@@ -172,7 +172,7 @@ TEST_F(RecordReader, AFilterAppliesToEveryHeaderOfTheFile) {
   StatsFileWriter w;
   w.append(header(bootNamed(1), 100));
   w.append(header(bootNamed(2), 200));
-  options.setOnly_boot_uuid(bootNamed(1));
+  query.onlyBoot = bootNamed(1);
   EXPECT_TRUE(read({write("a.stats", w)}).boots.empty());
 }
 

@@ -16,11 +16,8 @@ namespace {
 
 using test::setModificationTime;
 
-Options fromOptions(const std::string& path, std::optional<Date> cutoff = std::nullopt) {
-  Options o;
-  o.setFrom_path(path);
-  o.setLoad_periodic_files_newer_than(cutoff);
-  return o;
+StoreQuery fromQuery(const std::string& path, std::optional<Date> cutoff = std::nullopt) {
+  return StoreQuery{.fromPath = path, .periodicCutoff = cutoff};
 }
 
 TEST(StatsFileList, FromFindsNestedFilesAndOnlyTheExactSuffix) {
@@ -30,7 +27,7 @@ TEST(StatsFileList, FromFindsNestedFilesAndOnlyTheExactSuffix) {
   dir.write("x.stats.bak");
   dir.write("X.STATS");
   dir.write("a/statsfile");
-  EXPECT_EQ(statsFileList(fromOptions(dir.path())), (FileList{nested, top}));
+  EXPECT_EQ(statsFileList(fromQuery(dir.path())), (FileList{nested, top}));
 }
 
 TEST(StatsFileList, PeriodicFilesMustBeModifiedStrictlyAfterTheCutoff) {
@@ -43,8 +40,8 @@ TEST(StatsFileList, PeriodicFilesMustBeModifiedStrictlyAfterTheCutoff) {
   setModificationTime(later, 1700000001);
   setModificationTime(old, 1000);
   setModificationTime(inPeriodicDir, 1000);
-  EXPECT_EQ(statsFileList(fromOptions(dir.path(), Date{1700000000})), (FileList{old, later}));
-  EXPECT_EQ(statsFileList(fromOptions(dir.path())), (FileList{inPeriodicDir, old, atCutoff, later}));
+  EXPECT_EQ(statsFileList(fromQuery(dir.path(), Date{1700000000})), (FileList{old, later}));
+  EXPECT_EQ(statsFileList(fromQuery(dir.path())), (FileList{inPeriodicDir, old, atCutoff, later}));
 }
 
 TEST(StatsFileList, LocalStoreReadsItsDirectoriesWithoutEnteringSubdirectories) {
@@ -57,13 +54,13 @@ TEST(StatsFileList, LocalStoreReadsItsDirectoriesWithoutEnteringSubdirectories) 
   std::string user0 = root.write("var/log/com.vexil.launchd.peruser.0/user.stats");
   root.write("var/log/com.vexil.launchdX/other.stats");
   root.write("var/log/loose.stats");
-  EXPECT_EQ(statsFileList(Options()), (FileList{own, launchd, user0, user501}));
+  EXPECT_EQ(statsFileList(StoreQuery()), (FileList{own, launchd, user0, user501}));
 }
 
 TEST(StatsFileList, MissingLocalDirectoriesGiveAnEmptyList) {
   test::TempDir root;
   test::FakePlatform fake(root.path());
-  EXPECT_TRUE(statsFileList(Options()).empty());
+  EXPECT_TRUE(statsFileList(StoreQuery()).empty());
 }
 
 TEST(StatsFileList, DebugLinesNameEachScannedDirectory) {
@@ -72,7 +69,7 @@ TEST(StatsFileList, DebugLinesNameEachScannedDirectory) {
   std::ostringstream o, e;
   setConsole(&o, &e);
   gDebug = 1;
-  statsFileList(fromOptions(dir.path(), Date{0}));
+  statsFileList(fromQuery(dir.path(), Date{0}));
   gDebug = 0;
   setConsole(nullptr, nullptr);
   EXPECT_EQ(e.str(),
@@ -98,7 +95,7 @@ class Cleanup : public ::testing::Test {
   long long horizon = 0;
 };
 
-TEST_F(Cleanup, DeletesOnlyFilesOlderThanThreeDaysBeforeMidnightOutsideTheCurrentBoot) {
+TEST_F(Cleanup, DeletesOnlyFilesOlderThanTheHorizonOutsideTheCurrentBoot) {
   ASSERT_EQ(horizon, 1699660800);  // 2023-11-11 00:00:00
   std::string old = stale("var/db/brindlewick/old.stats", horizon - 1);
   std::string atHorizon = stale("var/db/brindlewick/edge.stats", horizon);
@@ -106,7 +103,7 @@ TEST_F(Cleanup, DeletesOnlyFilesOlderThanThreeDaysBeforeMidnightOutsideTheCurren
   std::string oldPeriodic = stale("var/log/com.vexil.launchd/x.periodic.stats", 1000);
   std::string perUser = stale("var/log/com.vexil.launchd.peruser.501/u.stats", 1000);
   std::string notStats = stale("var/db/brindlewick/old.txt", 1000);
-  removeOldStatsFiles();
+  removeOldStatsFiles(Date{static_cast<double>(horizon)});
   namespace fs = std::filesystem;
   EXPECT_FALSE(fs::exists(old));
   EXPECT_FALSE(fs::exists(oldPeriodic));
@@ -119,7 +116,7 @@ TEST_F(Cleanup, DeletesOnlyFilesOlderThanThreeDaysBeforeMidnightOutsideTheCurren
 TEST_F(Cleanup, NothingIsDeletedWhenTheCurrentBootIsUnknown) {
   fake.bootUuid.reset();
   std::string old = stale("var/db/brindlewick/old.stats", 1000);
-  removeOldStatsFiles();
+  removeOldStatsFiles(Date{static_cast<double>(horizon)});
   EXPECT_TRUE(std::filesystem::exists(old));
 }
 

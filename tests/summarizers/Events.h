@@ -9,7 +9,7 @@
 #include "Records/PowerStateChange.h"
 #include "Records/SleepWake.h"
 #include "Records/UserIdle.h"
-#include "model/Summarizer.h"
+#include "framework/Summarizer.h"
 
 namespace bw::test {
 

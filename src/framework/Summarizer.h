@@ -21,14 +21,14 @@
 #include "accum/HashFactory.h"
 #include "base/Range.h"
 #include "base/Uuid.h"
-#include "model/SummarizerContext.h"
-#include "model/Summary.h"
+#include "framework/SummarizerContext.h"
+#include "framework/Summary.h"
 #include "time/AbsRange.h"
 #include "time/AbsTime.h"
 
 namespace bw {
 
-class Model;
+class Timeline;
 
 class Summarizer {
  public:
@@ -65,7 +65,7 @@ class Summarizer {
   virtual SummaryComparator comparator() const { return nullptr; }
   // Fills `summary` over the relative range: each per-boot piece goes to the
   // absolute-range overload, then the summary's range becomes `range`.
-  virtual void summarize(Summary& summary, const Range& range, const Model& model);
+  virtual void summarize(Summary& summary, const Range& range, const Timeline& timeline);
   // Adds one absolute range's totals; nothing by default.
   virtual void summarize(Summary& summary, const AbsRange& range);
 

@@ -1,9 +1,9 @@
-#include "model/Summarizer.h"
+#include "framework/Summarizer.h"
 
 #include <algorithm>
 
 #include "Records/SleepWake.h"
-#include "model/Model.h"
+#include "time/Timeline.h"
 
 namespace bw {
 
@@ -83,8 +83,8 @@ SummarizerContext* Summarizer::contextForBoot(const Uuid& boot) const {
   return contexts_->objectForKeyedSubscript(boot).get();
 }
 
-void Summarizer::summarize(Summary& summary, const Range& range, const Model& model) {
-  for (const AbsRange& piece : model.absoluteTimeRangesForRelativeRange(range)) summarize(summary, piece);
+void Summarizer::summarize(Summary& summary, const Range& range, const Timeline& timeline) {
+  for (const AbsRange& piece : timeline.absoluteRangesForRelativeRange(range)) summarize(summary, piece);
   summary.setRange(range);
 }
 

@@ -2,7 +2,7 @@
 
 #include "Records/SleepWake.h"
 #include "Records/UserIdle.h"
-#include "model/Summarizer.h"
+#include "framework/Summarizer.h"
 
 namespace bw {
 namespace {

@@ -1,4 +1,4 @@
-#include "model/Summary.h"
+#include "framework/Summary.h"
 
 #include <cmath>
 #include <limits>

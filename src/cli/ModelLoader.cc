@@ -1,0 +1,55 @@
+#include "cli/ModelLoader.h"
+
+#include "base/Console.h"
+#include "cli/Options.h"
+#include "model/Model.h"
+#include "store/RecordReader.h"
+#include "time/BootSequencer.h"
+
+namespace bw {
+
+StoreQuery storeQuery(const Options& options) {
+  StoreQuery query;
+  query.fromPath = options.from_path();
+  query.periodicCutoff = options.load_periodic_files_newer_than();
+  query.onlyBoot = options.only_boot_uuid();
+  query.onlySystemVersion = options.only_system_version();
+  return query;
+}
+
+DomainSpec domainSpec(const Options& options) {
+  DomainSpec spec;
+  spec.type = options.domain_type();
+  spec.start = options.domain_start();
+  spec.end = options.domain_end();
+  spec.day = YearMonthDay{static_cast<std::int32_t>(options.domain_ymd_year()),
+                          static_cast<std::int32_t>(options.domain_ymd_month()),
+                          static_cast<std::int32_t>(options.domain_ymd_day())};
+  return spec;
+}
+
+bool feedsSummarizers(const Options& options) {
+  return options.mode() != kModeDump && options.mode() != kModeShowEvents;
+}
+
+FileList runFileList(const StoreQuery& query) {
+  FileList files = statsFileList(query);
+  if (query.fromPath && files.empty()) exitWithMessage(66, "--from path contained no Brindlewick trace files.");
+  return files;
+}
+
+std::vector<std::unique_ptr<Model>> loadModels(const Options& options) {
+  const StoreQuery query = storeQuery(options);
+  const FileList files = runFileList(query);
+  RecordsByBoot read = readStatsFiles(std::vector<std::string>(files.begin(), files.end()), query);
+  auto pool = std::make_shared<RecordPool>(std::move(read.pool));
+  std::vector<std::unique_ptr<Model>> models;
+  for (auto& [version, timeline] : sequenceBoots(read.boots)) {
+    auto model = std::make_unique<Model>(std::move(timeline), version);
+    model->retainRecords(pool);
+    models.push_back(std::move(model));
+  }
+  return models;
+}
+
+}  // namespace bw

@@ -1,0 +1,31 @@
+#pragma once
+// The command line's edge: translates `Options` into what the lower stages
+// take (the store's query, the domain's spec, whether summarizers are fed)
+// and builds the models of a run from them.
+#include <memory>
+#include <vector>
+
+#include "domains/DomainSpec.h"
+#include "store/StatsFileList.h"
+#include "store/StoreQuery.h"
+
+namespace bw {
+
+class Model;
+class Options;
+
+StoreQuery storeQuery(const Options& options);
+DomainSpec domainSpec(const Options& options);
+// Whether the mode reads summarizers: the record dump and the event listing
+// need only the domains.
+bool feedsSummarizers(const Options& options);
+
+// The stats files of the run. A `--from` directory without any ends the run
+// with "--from path contained no Brindlewick trace files." (status 66).
+FileList runFileList(const StoreQuery& query);
+
+// Reads the store the options select and builds one model per system
+// version, each holding its boots in sequence; nothing is fed yet.
+std::vector<std::unique_ptr<Model>> loadModels(const Options& options);
+
+}  // namespace bw
