@@ -23,6 +23,8 @@ namespace bw {
 
 class SawtoothInterpolator {
  public:
+  static constexpr const char* kClassName = "SawtoothInterpolator";
+
   SawtoothInterpolator();
 
   // Throws kInvalidArgumentException "pos <= maxPosition" (user info "pos",

@@ -53,6 +53,16 @@ class Model {
   std::vector<std::unique_ptr<Summary>> summarizeTop(const std::string& key, const std::vector<Range>& ranges,
                                                      const std::function<bool(const Summary&)>& filter) const;
   std::vector<std::unique_ptr<Summary>> sortedPowerSummariesInRanges(const std::vector<Range>& ranges) const;
+  // "CPU" summaries with a residency denominator of at least 60000, lowest
+  // residency first (the comparator ranks by residency descending).
+  std::vector<std::unique_ptr<Summary>> sortedCPUSummariesInRanges(const std::vector<Range>& ranges) const;
+  // "IO" summaries with a non-zero duration, most bytes first.
+  std::vector<std::unique_ptr<Summary>> sortedIOSummariesInRanges(const std::vector<Range>& ranges) const;
+  // Package C-state residency in percent over `ranges`; NaN when the
+  // residency denominator is below 60 (far below the sorted list's 60000).
+  double averageCStateResidencyForRanges(const std::vector<Range>& ranges) const;
+  // The same over the positions within `ranges` where all `keys` held.
+  double averageCStateResidencyForState(const std::vector<std::string>& keys, const std::vector<Range>& ranges) const;
 
   std::uint64_t wallTimeForRelative(std::uint64_t position) const;
   std::optional<AbsTime> absoluteTimeForRelative(std::uint64_t position) const;

@@ -1,6 +1,8 @@
 #include "summarizers/ModelSummarizers.h"
 
 #include "summarizers/BatterySummarizer.h"
+#include "summarizers/CPUSummarizer.h"
+#include "summarizers/IOSummarizer.h"
 #include "summarizers/PowerStateSummarizers.h"
 #include "summarizers/StandbySummarizer.h"
 
@@ -21,6 +23,8 @@ std::vector<std::pair<std::string, std::unique_ptr<Summarizer>>> makeModelSummar
   add("Bluetooth", std::make_unique<BluetoothSummarizer>());
   add("DiscreteGraphics", std::make_unique<DiscreteGraphicsSummarizer>());
   add("Wi-Fi", std::make_unique<WiFiSummarizer>());
+  add("CPU", std::make_unique<CPUSummarizer>());
+  add("IO", std::make_unique<IOSummarizer>());
   add("Power", std::make_unique<BatterySummarizer>());
   add("Standby", std::make_unique<StandbySummarizer>());
   return all;
