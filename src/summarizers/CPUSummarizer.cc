@@ -15,9 +15,6 @@ double residency(const Summary& s) {
   return c.avgCStateResidencyNumer() / c.avgCStateResidencyDenom();
 }
 
-// QoS time within a range: never more than the range, negative as it is.
-double clampedTime(double slope, double length) { return std::min(length, std::min(slope, 1.0) * length); }
-
 }  // namespace
 
 CPUSummarizer::CPUSummarizer() { setDiscreteRanges(true); }
@@ -63,6 +60,10 @@ void CPUSummarizer::addEvent(const Record& event, std::uint64_t position, const 
   }
 }
 
+double CPUSummarizer::qosTimeInRange(double slope, double length) {
+  return std::min(length, std::min(slope, 1.0) * length);
+}
+
 int CPUSummarizer::compareResidency(const Summary& a, const Summary& b) {
   return compareWithTolerance(residency(b), residency(a));
 }
@@ -99,8 +100,8 @@ void CPUSummarizer::summarize(Summary& summary, const AbsRange& range) {
   const double bg = boot->qosBg().averageSlopeFrom(start, end);
   const double idle = boot->qosIdle().averageSlopeFrom(start, end);
   if (!std::isnan(bg) && !std::isnan(idle)) {
-    s.setQosBgTime(s.qosBgTime() + clampedTime(bg, L));
-    s.setQosIdleTime(s.qosIdleTime() + clampedTime(idle, L));
+    s.setQosBgTime(s.qosBgTime() + qosTimeInRange(bg, L));
+    s.setQosIdleTime(s.qosIdleTime() + qosTimeInRange(idle, L));
     s.setQosDenom(s.qosDenom() + L);
   }
 

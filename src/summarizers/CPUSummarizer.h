@@ -97,6 +97,10 @@ class CPUSummarizer : public Summarizer {
   // frequency sets the summary's.
   void summarize(Summary& summary, const AbsRange& range) override;
   using Summarizer::summarize;
+  // A range's QoS time from its counter's slope: never more than the range
+  // (the outer minimum is redundant and kept), not clamped below, so a
+  // negative slope is added as it is.
+  static double qosTimeInRange(double slope, double length);
 
   const Boots& boots() const { return boots_; }
   void setBoots(Boots boots) { boots_ = std::move(boots); }

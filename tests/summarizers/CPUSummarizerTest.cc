@@ -1,0 +1,189 @@
+#include "summarizers/CPUSummarizer.h"
+
+#include <gtest/gtest.h>
+
+#include <cmath>
+#include <utility>
+#include <vector>
+
+#include "Events.h"
+#include "Records/Cstates.h"
+#include "Records/Interrupts.h"
+#include "Records/PackageEnergyStatistics.h"
+
+namespace bw {
+namespace {
+
+using test::boot;
+using test::feed;
+using test::make;
+using Levels = std::map<std::uint64_t, double>;
+constexpr std::uint64_t kMinute = 60000;
+
+struct Pkg {
+  std::uint64_t cany = 0, freq = 0, nominal = 0, bg = 0, idle = 0, cmax = 0;
+};
+PackageEnergyStatistics pkg(const Pkg& p) {
+  return make<PackageEnergyStatistics>([&](PackageEnergyStatistics& r) {
+    r.setPkgCanyResidency(p.cany), r.setPkgCmaxResidency(p.cmax), r.setPkgFreq(p.freq);
+    r.setPkgFreqNominal(p.nominal), r.setQosBgTime(p.bg), r.setQosIdleTime(p.idle);
+  });
+}
+Cstates cstates(std::int64_t core, const std::vector<std::pair<std::uint64_t, std::uint64_t>>& levels) {
+  return make<Cstates>([&](Cstates& r) {
+    r.setCore(core), r.setIsCore(core != -1);
+    for (auto [level, residency] : levels)
+      r.addStates(make<Cstate>([&](Cstate& c) { c.setLevel(level), c.setResidency(residency); }));
+  });
+}
+Interrupts interrupts(const std::vector<std::uint64_t>& counts) {
+  return make<Interrupts>([&](Interrupts& r) {
+    for (std::uint64_t n : counts)
+      r.addVectors(make<InterruptVector>([&](InterruptVector& v) { v.setInterruptCount(n); }));
+  });
+}
+
+CPUSummary summarize(CPUSummarizer& s, std::uint64_t start, std::uint64_t end, std::uint8_t bootNumber = 1) {
+  CPUSummary summary;
+  s.summarize(summary, AbsRange::rangeWithBoot(boot(bootNumber), start, end));
+  return summary;
+}
+
+// Two minutes between package samples at 1 and 3 minutes: residency 0.75,
+// levels 3 and 6 at 0.25 and 0.5, 0.5 interrupts per ms, 2400 MHz.
+TEST(CPUSummary, HandComputedAveragesAndTheirDerivedFigures) {
+  CPUSummarizer s;
+  feed(s, pkg({.cany = 1000, .freq = 2400}), kMinute);  // no nominal frequency yet
+  feed(s, cstates(-1, {{3, 1000}, {6, 1000}}), kMinute);
+  feed(s, interrupts({}), kMinute);                      // an empty record: a total of 0 here
+  feed(s, cstates(0, {{3, 0}, {9, 500}}), 2 * kMinute);  // a core's record changes nothing
+  feed(s, pkg({.cany = 91000, .freq = 2000, .nominal = 2600}), 3 * kMinute);
+  feed(s, cstates(-1, {{3, 31000}, {6, 61000}}), 3 * kMinute);
+  feed(s, interrupts({40000, 20000}), 3 * kMinute);
+  feed(s, pkg({.cany = 100000, .freq = 2000, .nominal = 3000}), 4 * kMinute);  // a later nominal is ignored
+
+  const CPUSummary c = summarize(s, kMinute, 3 * kMinute);
+  EXPECT_DOUBLE_EQ(c.avgCStateResidencyNumer(), 90000);
+  EXPECT_EQ(c.avgCStateResidencyDenom(), 120000);
+  ASSERT_TRUE(c.avgCStateResidencyBreakdown());
+  EXPECT_EQ(*c.avgCStateResidencyBreakdown(), (Levels{{3, 30000}, {6, 60000}}));
+  EXPECT_DOUBLE_EQ(c.avgInterruptRateNumer(), 60000);
+  EXPECT_EQ(c.avgInterruptRateDenom(), 120000);
+  EXPECT_DOUBLE_EQ(c.avgPkgFrequencyNumer(), 2400.0 * 120000);  // the samples within [start, end)
+  EXPECT_EQ(c.nominalPkgFrequency(), 2600);
+  EXPECT_EQ(c.qosDenom(), 0);  // no QoS counters at all
+
+  EXPECT_DOUBLE_EQ(averagePkgFrequencyGHz(c), 2.4);
+  EXPECT_EQ(interruptRateHz(c), 500);
+  EXPECT_DOUBLE_EQ(cStateResidencyPercent(c), 75);
+  EXPECT_DOUBLE_EQ(cStateLevelPercent(c, 3), 25);
+  EXPECT_DOUBLE_EQ(cStateLevelPercent(c, 6), 50);
+  EXPECT_TRUE(std::isnan(cStateLevelPercent(c, 9)));
+  EXPECT_TRUE(std::isnan(backgroundQoSRatioPercent(c)));
+  EXPECT_TRUE(std::isnan(averagePkgFrequencyGHz(CPUSummary{})));
+}
+
+TEST(CPUSummary, ARangeCountsFromOneMinuteOnAndWithoutADeepestStateCounter) {
+  for (std::uint64_t length : {kMinute - 1, kMinute}) {
+    SCOPED_TRACE(length);
+    CPUSummarizer s;
+    feed(s, pkg({.cany = 10000, .freq = 1800, .cmax = 0}), 100000);
+    feed(s, pkg({.cany = 10000 + length / 2, .freq = 1800, .cmax = 0}), 100000 + length);
+    const CPUSummary c = summarize(s, 100000, 100000 + length);
+    const double expected = length < kMinute ? 0 : static_cast<double>(length);
+    EXPECT_EQ(c.avgCStateResidencyDenom(), expected);
+    EXPECT_EQ(c.avgCStateResidencyNumer(), expected / 2);
+    EXPECT_EQ(c.avgPkgFrequencyDenom(), expected);
+  }
+}
+
+TEST(CPUSummary, QoSNeedsBothSlopesAndIsClampedAboveOnly) {
+  struct Case {
+    Pkg first, second;
+    double bgTime, idleTime, denom;
+  } cases[] = {
+      {{.bg = 1000, .idle = 1000}, {.bg = 241000, .idle = 61000}, 120000, 60000, 120000},  // bg slope 2 counts as 1
+      {{.bg = 1000}, {.bg = 61000}, 0, 0, 0},                                              // idle never sampled
+      {{.idle = 1000}, {.idle = 61000}, 0, 0, 0},                                          // bg never sampled
+  };
+  for (const Case& k : cases) {
+    CPUSummarizer s;
+    feed(s, pkg(k.first), kMinute);
+    feed(s, pkg(k.second), 3 * kMinute);
+    const CPUSummary c = summarize(s, kMinute, 3 * kMinute);
+    EXPECT_EQ(c.qosBgTime(), k.bgTime);
+    EXPECT_EQ(c.qosIdleTime(), k.idleTime);
+    EXPECT_EQ(c.qosDenom(), k.denom);
+  }
+  // A negative slope cannot come from counters that only grow between
+  // resets; the clamp itself keeps it.
+  EXPECT_EQ(CPUSummarizer::qosTimeInRange(2.0, 1000), 1000);
+  EXPECT_EQ(CPUSummarizer::qosTimeInRange(0.25, 1000), 250);
+  EXPECT_EQ(CPUSummarizer::qosTimeInRange(-0.5, 1000), -500);
+  CPUSummary q;
+  q.setQosBgTime(30), q.setQosIdleTime(40), q.setQosDenom(100);
+  EXPECT_DOUBLE_EQ(backgroundQoSRatioPercent(q), 50);
+}
+
+TEST(CPUSummary, RangesRunBetweenPackageSamplesAndEndAtSleepAndReboot) {
+  CPUSummarizer s;
+  feed(s, pkg({}), 10);
+  feed(s, interrupts({5}), 15);  // only package samples close ranges
+  feed(s, pkg({}), 20);
+  feed(s, test::sleepWake(0), 25);
+  feed(s, pkg({}), 30);
+  feed(s, pkg({}), 40);
+  feed(s, pkg({}), 50, 2);  // a new boot drops the range open since 40
+  feed(s, pkg({}), 60, 2);
+  feed(s, pkg({}), 70, 3);  // a boot with one package sample: no range
+  EXPECT_EQ(s.ranges(), (std::vector<Range>{{10, 10}, {30, 10}, {50, 10}}));
+}
+
+TEST(CPUSummary, BadCountersLeaveTheirQuantityOut) {
+  CPUSummarizer s;
+  feed(s, pkg({.cany = 50000}), kMinute);
+  feed(s, interrupts({9000}), kMinute);
+  feed(s, pkg({.cany = 10}), 3 * kMinute);  // residency went backwards: one lone sample after the reset
+  feed(s, interrupts({90000}), 3 * kMinute);
+  feed(s, cstates(-1, {{7, 12000}}), 3 * kMinute);  // a level seen once, counted from 0 at boot
+  feed(s, PackageEnergyStatistics{}, 5 * kMinute);  // every field missing
+  feed(s, PackageEnergyStatistics{}, 7 * kMinute);
+
+  const CPUSummary across = summarize(s, kMinute, 3 * kMinute);
+  EXPECT_EQ(across.avgCStateResidencyDenom(), 0);
+  EXPECT_FALSE(across.avgCStateResidencyBreakdown());
+  EXPECT_DOUBLE_EQ(across.avgInterruptRateNumer(), 81000);
+  EXPECT_EQ(across.avgPkgFrequencyDenom(), 0);  // frequency 0 is left out
+  EXPECT_TRUE(std::isnan(cStateResidencyPercent(across)));
+
+  const CPUSummary empty = summarize(s, 5 * kMinute, 7 * kMinute);
+  EXPECT_EQ(empty.avgCStateResidencyNumer(), 0);  // missing counters read as 0: residency 0
+  EXPECT_EQ(empty.avgCStateResidencyDenom(), 2 * kMinute);
+  EXPECT_EQ(empty.avgPkgFrequencyDenom(), 0);  // and frequency left out
+  EXPECT_EQ(empty.nominalPkgFrequency(), 0);
+
+  CPUSummarizer fresh;
+  feed(fresh, pkg({.cany = 0}), kMinute);
+  feed(fresh, cstates(-1, {{7, 12000}}), 3 * kMinute);
+  feed(fresh, pkg({.cany = 60000}), 3 * kMinute);
+  const CPUSummary once = summarize(fresh, kMinute, 3 * kMinute);
+  ASSERT_TRUE(once.avgCStateResidencyBreakdown());
+  ASSERT_EQ(once.avgCStateResidencyBreakdown()->count(7), 1u);
+  EXPECT_NEAR(once.avgCStateResidencyBreakdown()->at(7), 8000, 1e-9);                 // 12000 - 4000 at the range start
+  EXPECT_EQ(summarize(fresh, kMinute, 3 * kMinute, 9).avgCStateResidencyDenom(), 0);  // a boot never seen
+}
+
+TEST(CPUSummary, ComparatorRanksByResidencyDescendingWithinTheEpsilon) {
+  auto withResidency = [](double numer, double denom) {
+    CPUSummary c;
+    c.setAvgCStateResidencyNumer(numer), c.setAvgCStateResidencyDenom(denom);
+    return c;
+  };
+  const CPUSummary low = withResidency(30, 100), high = withResidency(0.9, 1);
+  EXPECT_GT(CPUSummarizer::compareResidency(low, high), 0);
+  EXPECT_LT(CPUSummarizer::compareResidency(high, low), 0);
+  EXPECT_EQ(CPUSummarizer::compareResidency(withResidency(0.3, 1), withResidency(0.1 + 0.2, 1)), 0);
+}
+
+}  // namespace
+}  // namespace bw
