@@ -18,6 +18,8 @@
 namespace bw {
 
 class Options;
+class ProcessSummarizer;
+class ProcessSummary;
 class RecordPool;
 
 class Model {
@@ -60,6 +62,16 @@ class Model {
   std::vector<std::unique_ptr<Summary>> summarizeTop(const std::string& key, const std::vector<Range>& ranges,
                                                      const std::function<bool(const Summary&)>& filter) const;
   std::vector<std::unique_ptr<Summary>> sortedPowerSummariesInRanges(const std::vector<Range>& ranges) const;
+
+  // The "Processes" summarizer, or null.
+  ProcessSummarizer* processes() const;
+  // Job summaries into `summary` over one absolute range, over the pieces
+  // of one relative range, or into a new summary over the pieces of
+  // `ranges`; `includingSubjobs` adds what each job owns to its line.
+  void summarizeProcesses(ProcessSummary& summary, bool includingSubjobs, const AbsRange& range) const;
+  void summarizeProcesses(ProcessSummary& summary, bool includingSubjobs, const Range& range) const;
+  std::unique_ptr<ProcessSummary> summarizeProcessesIncludingSubjobs(bool includingSubjobs,
+                                                                     const std::vector<Range>& ranges) const;
 
   std::uint64_t wallTimeForRelative(std::uint64_t position) const;
   std::optional<AbsTime> absoluteTimeForRelative(std::uint64_t position) const;

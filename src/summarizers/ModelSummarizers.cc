@@ -2,6 +2,7 @@
 
 #include "summarizers/BatterySummarizer.h"
 #include "summarizers/PowerStateSummarizers.h"
+#include "summarizers/ProcessSummarizer.h"
 #include "summarizers/StandbySummarizer.h"
 
 namespace bw {
@@ -22,6 +23,7 @@ std::vector<std::pair<std::string, std::unique_ptr<Summarizer>>> makeModelSummar
   add("DiscreteGraphics", std::make_unique<DiscreteGraphicsSummarizer>());
   add("Wi-Fi", std::make_unique<WiFiSummarizer>());
   add("Power", std::make_unique<BatterySummarizer>());
+  add("Processes", std::make_unique<ProcessSummarizer>());
   add("Standby", std::make_unique<StandbySummarizer>());
   return all;
 }
