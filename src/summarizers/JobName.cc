@@ -23,8 +23,7 @@ Search& search() {
   static const icu::RegexPattern* const pattern = [] {
     UErrorCode status = U_ZERO_ERROR;
     UParseError parseError{};
-    icu::RegexPattern* p =
-        icu::RegexPattern::compile(icu::UnicodeString::fromUTF8(kPattern), 0, parseError, status);
+    icu::RegexPattern* p = icu::RegexPattern::compile(icu::UnicodeString::fromUTF8(kPattern), 0, parseError, status);
     if (U_FAILURE(status)) terminateUnsupported("job name pattern does not compile");
     return p;
   }();

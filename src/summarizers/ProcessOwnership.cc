@@ -62,8 +62,8 @@ Job* ProcessBootContext::findOwnerForProcess(const std::shared_ptr<Process>& sta
     std::uint64_t u = p->responsible_uniqueid();
     if (u == 0) u = p->parent_uniqueid();
     if (u == 0 && p->pid() != 0 && p->pid() != 1) {
-      debugLine(format("Bad data: PID %u [%s] had responsible & parent process both 0", p->pid(),
-                       textOrNull(p->label())));
+      debugLine(
+          format("Bad data: PID %u [%s] had responsible & parent process both 0", p->pid(), textOrNull(p->label())));
       p->setOwner(p->job());
       found = p->owner();
       break;
@@ -89,8 +89,8 @@ Job* ProcessBootContext::findOwnerForProcess(const std::shared_ptr<Process>& sta
     const std::shared_ptr<Process>& p = *it;
     Job* owner = found;
     if (!owner) {
-      debugLine(format("Could not find an owner for PID %u [%s]; marking owned by itself", p->pid(),
-                       textOrNull(p->label())));
+      debugLine(
+          format("Could not find an owner for PID %u [%s]; marking owned by itself", p->pid(), textOrNull(p->label())));
       owner = p->job();
     }
     if (owner) owner->addOwnedProcessToUmbrella(p, uuid_);

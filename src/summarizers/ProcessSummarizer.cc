@@ -51,8 +51,8 @@ void ProcessSummarizer::addProcessUsage(const ProcessUsage& record, ProcessBootC
     if (record.hasName()) p->setCleanedLabel(names_.cleanedLabel(record.name()));
     if (record.hasDisplayName()) p->setDisplayName(names_.shared(record.displayName()));
     p->setStart_time(AbsTime{absTime.boot, record.procStartAbstime()});
-    for (Interpolator* curve : {&p->cpuTime(), &p->idle_wakeups(), &p->interrupts(), &p->pageins(),
-                                &p->residentSize(), &p->wired()})
+    for (Interpolator* curve :
+         {&p->cpuTime(), &p->idle_wakeups(), &p->interrupts(), &p->pageins(), &p->residentSize(), &p->wired()})
       curve->addValue(0, record.procStartAbstime());
     if (status == kGone) context.processes().removeObjectForKey(record.uniqueid());
   }
@@ -75,8 +75,7 @@ void ProcessSummarizer::addProcessUsage(const ProcessUsage& record, ProcessBootC
   if (record.residentSize() != 0) p->residentSize().addValue(static_cast<double>(record.residentSize()), t);
   // `wired` keeps only its initial 0 on purpose.
 
-  if (status != kStillRunning && status != kSnapshot)
-    p->setExit_time(AbsTime{absTime.boot, record.procExitAbstime()});
+  if (status != kStillRunning && status != kSnapshot) p->setExit_time(AbsTime{absTime.boot, record.procExitAbstime()});
 }
 
 void ProcessSummarizer::setLastPosition(std::uint64_t) { createJobsFromProcesses(); }

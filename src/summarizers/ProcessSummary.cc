@@ -23,9 +23,7 @@ int ProcessSummary::compareMaxResidentSize(const ProcessSummary& o) const {
 int ProcessSummary::compareMaxWired(const ProcessSummary& o) const {
   return compareWithTolerance(maxWired_, o.maxWired_);
 }
-int ProcessSummary::comparePageins(const ProcessSummary& o) const {
-  return compareWithTolerance(pageins_, o.pageins_);
-}
+int ProcessSummary::comparePageins(const ProcessSummary& o) const { return compareWithTolerance(pageins_, o.pageins_); }
 int ProcessSummary::comparePowerScores(const ProcessSummary& o) const {
   return compareWithTolerance(powerScore(), o.powerScore());
 }
@@ -39,9 +37,8 @@ std::vector<const ProcessSummary*> ProcessSummary::subprocessesSortedBySelector(
   for (const auto& [key, summary] : subprocesses_) sorted.push_back(summary.get());
   // A merge sort: the tolerance makes "equal" not transitive, which a
   // merge sort survives without leaving the array.
-  std::stable_sort(sorted.begin(), sorted.end(), [comparison](const ProcessSummary* a, const ProcessSummary* b) {
-    return (a->*comparison)(*b) < 0;
-  });
+  std::stable_sort(sorted.begin(), sorted.end(),
+                   [comparison](const ProcessSummary* a, const ProcessSummary* b) { return (a->*comparison)(*b) < 0; });
   std::reverse(sorted.begin(), sorted.end());
   return sorted;
 }

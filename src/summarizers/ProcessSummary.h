@@ -63,14 +63,10 @@ class ProcessSummary : public Summary {
   const std::string* label() const { return hasLabel_ ? &label_ : nullptr; }
   void setLabel(const std::string* v) { hasLabel_ = v != nullptr, label_ = v ? *v : std::string(); }
   const std::string* displayName() const { return hasDisplayName_ ? &displayName_ : nullptr; }
-  void setDisplayName(const std::string* v) {
-    hasDisplayName_ = v != nullptr, displayName_ = v ? *v : std::string();
-  }
+  void setDisplayName(const std::string* v) { hasDisplayName_ = v != nullptr, displayName_ = v ? *v : std::string(); }
 
   std::unordered_map<std::string, std::unique_ptr<ProcessSummary>>& subprocesses() { return subprocesses_; }
-  const std::unordered_map<std::string, std::unique_ptr<ProcessSummary>>& subprocesses() const {
-    return subprocesses_;
-  }
+  const std::unordered_map<std::string, std::unique_ptr<ProcessSummary>>& subprocesses() const { return subprocesses_; }
 
  private:
   double elapsedTime_ = 0;

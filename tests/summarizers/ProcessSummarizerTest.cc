@@ -69,7 +69,8 @@ TEST(JobName, CleaningRemovesInstanceSuffixesAndLauncherSlotsOnly) {
       {"com.harbor.browser", "com.harbor.browser"},
       {"Foo", "Foo"},
   };
-  for (const auto& c : cases) EXPECT_EQ(Process::stringByRemovingTrailingUUIDsAndLaunchServicesStuff(c.name), c.cleaned);
+  for (const auto& c : cases)
+    EXPECT_EQ(Process::stringByRemovingTrailingUUIDsAndLaunchServicesStuff(c.name), c.cleaned);
   JobNames names;
   EXPECT_EQ(names.cleanedLabel("Foo.12"), names.cleanedLabel("Foo.34"));
   EXPECT_EQ(names.cleanedLabel("Foo"), names.cleanedLabel("Foo.34"));
@@ -159,8 +160,8 @@ TEST_F(Ownership, OwnersFollowResponsibleThenParentIdsUpToALaunchd) {
   const struct {
     std::uint64_t uniqueid;
     const char* owner;
-  } owners[] = {{1, "launchd"}, {2, "launchd"}, {10, "App"},   {11, "App"},
-                {12, "App"},     {13, "Self"},    {14, "Orphan"}, {15, "Zero"}};
+  } owners[] = {{1, "launchd"}, {2, "launchd"}, {10, "App"},    {11, "App"},
+                {12, "App"},    {13, "Self"},   {14, "Orphan"}, {15, "Zero"}};
   for (const auto& o : owners) EXPECT_EQ(process(s, o.uniqueid)->owner(), job(o.owner)) << o.uniqueid;
   EXPECT_EQ(s.boots().objectForKeyedSubscript(boot(1))->launchds(), (std::unordered_set<std::uint64_t>{0, 1, 2}));
   // The helper and the tool count under the application; the orphan counts
@@ -197,14 +198,45 @@ TEST_F(Ownership, AParentIdCycleEndsWithOneOfItsProcessesOwningBoth) {
 class JobSummaries : public ProcessAccounting {
  protected:
   JobSummaries() {
-    feed(s, {.uniqueid = 10, .at = 500, .name = "App", .parent = 1, .responsible = 10, .cpuMs = 50, .idle = 4,
-             .start = 100, .resident = 8192});
-    feed(s, {.uniqueid = 10, .at = 1000, .status = 0, .name = "App", .parent = 1, .responsible = 10,
-             .cpuMs = 100, .idle = 10, .interrupts = 20, .start = 100, .resident = 4096});
-    feed(s, {.uniqueid = 11, .at = 1000, .status = 0, .name = "Helper", .parent = 1, .responsible = 10,
-             .cpuMs = 40, .idle = 6, .interrupts = 8, .start = 200});
-    feed(s, {.uniqueid = 12, .at = 1500, .name = "Daemon", .parent = 1, .responsible = 12, .cpuMs = 10,
-             .idle = 1, .interrupts = 3, .start = 50});
+    feed(s, {.uniqueid = 10,
+             .at = 500,
+             .name = "App",
+             .parent = 1,
+             .responsible = 10,
+             .cpuMs = 50,
+             .idle = 4,
+             .start = 100,
+             .resident = 8192});
+    feed(s, {.uniqueid = 10,
+             .at = 1000,
+             .status = 0,
+             .name = "App",
+             .parent = 1,
+             .responsible = 10,
+             .cpuMs = 100,
+             .idle = 10,
+             .interrupts = 20,
+             .start = 100,
+             .resident = 4096});
+    feed(s, {.uniqueid = 11,
+             .at = 1000,
+             .status = 0,
+             .name = "Helper",
+             .parent = 1,
+             .responsible = 10,
+             .cpuMs = 40,
+             .idle = 6,
+             .interrupts = 8,
+             .start = 200});
+    feed(s, {.uniqueid = 12,
+             .at = 1500,
+             .name = "Daemon",
+             .parent = 1,
+             .responsible = 12,
+             .cpuMs = 10,
+             .idle = 1,
+             .interrupts = 3,
+             .start = 50});
     s.setLastPosition(1500);
   }
   std::unique_ptr<ProcessSummary> summarize(bool includingSubjobs, std::vector<AbsRange> ranges = {whole()}) {
@@ -254,10 +286,11 @@ TEST_F(JobSummaries, SpawnsRuntimeSizesAndStillRunningPerJob) {
   EXPECT_EQ(root->maxResidentSize(), 8192);
 
   // Split ranges add up; a later range sees no new spawn.
-  auto split = summarize(false, {AbsRange::rangeWithBoot(boot(1), 0, 600), AbsRange::rangeWithBoot(boot(1), 600, 1400)});
+  auto split =
+      summarize(false, {AbsRange::rangeWithBoot(boot(1), 0, 600), AbsRange::rangeWithBoot(boot(1), 600, 2000)});
   EXPECT_DOUBLE_EQ(split->cpuTime(), root->cpuTime());
   EXPECT_EQ(split->spawns(), 3);
-  auto late = summarize(false, {AbsRange::rangeWithBoot(boot(1), 1200, 300)});
+  auto late = summarize(false, {AbsRange::rangeWithBoot(boot(1), 1200, 1500)});
   EXPECT_EQ(late->spawns(), 0);
   EXPECT_EQ(late->subprocesses().at("App")->runtime(), 0);
 }
@@ -317,7 +350,7 @@ TEST(ProcessSummary, SubprocessesSortLargestFirstByEachComparison) {
 TEST(JobGraph, RowsMarkColumnsAboveEachThreshold) {
   auto p = std::make_shared<Process>();
   p->cpuTime().addValue(0, 0);
-  p->cpuTime().addValue(2.5e9, 500);          // 5 per column for the first half
+  p->cpuTime().addValue(2.5e9, 500);           // 5 per column for the first half
   p->cpuTime().addValue(2.5e9 + 2.5e7, 1000);  // 0.05 per column after
   Job job;
   job.addProcess(p, boot(1));
@@ -326,8 +359,8 @@ TEST(JobGraph, RowsMarkColumnsAboveEachThreshold) {
   const struct {
     const char* label;
     double threshold;
-  } rows[] = {{"100.00%   |", 1000}, {" 31.62%   |", 316.2},  {" 10.000%  |", 100},  {"  3.162%  |", 31.62},
-              {"  1.000%  |", 10},   {"   0.3162%|", 3.162},  {"   0.1000%|", 1},    {"   0.0316%|", 0.3162},
+  } rows[] = {{"100.00%   |", 1000}, {" 31.62%   |", 316.2},   {" 10.000%  |", 100},  {"  3.162%  |", 31.62},
+              {"  1.000%  |", 10},   {"   0.3162%|", 3.162},   {"   0.1000%|", 1},    {"   0.0316%|", 0.3162},
               {"   0.0100%|", 0.1},  {"   0.0031%|", 0.03162}, {"   0.0010%|", 0.01}, {"   0.0003%|", 0.003162}};
   std::string expected;
   for (const auto& row : rows) {
