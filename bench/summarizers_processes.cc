@@ -9,7 +9,9 @@
 #include <sys/resource.h>
 
 #include <cstdio>
+#include <map>
 #include <memory>
+#include <tuple>
 #include <vector>
 
 #include "LargeStore.h"
@@ -51,26 +53,38 @@ std::size_t feedAll(std::vector<std::unique_ptr<bw::ProcessSummarizer>>& summari
   return records;
 }
 
-std::size_t processCount(std::vector<std::unique_ptr<bw::ProcessSummarizer>>& summarizers) {
-  std::size_t n = 0;
+// The processes, and the bytes their curves' samples take at 16 bytes a
+// sample (position and value).
+std::pair<std::size_t, std::size_t> processesAndPointBytes(
+    std::vector<std::unique_ptr<bw::ProcessSummarizer>>& summarizers) {
+  std::size_t n = 0, points = 0;
+  const auto countPoints = [&](std::uint64_t, const std::shared_ptr<bw::Process>& p, bool&) {
+    for (bw::Interpolator* curve :
+         {&p->cpuTime(), &p->idle_wakeups(), &p->interrupts(), &p->pageins(), &p->residentSize(), &p->wired()})
+      points += curve->dataSet().count();
+  };
   for (auto& s : summarizers) {
-    s->boots().enumerateKeysAndObjectsUsingBlock([&](const bw::Uuid&,
-                                                     const std::shared_ptr<bw::ProcessBootContext>& boot,
-                                                     bool&) { n += boot->processes().count(); });
+    s->boots().enumerateKeysAndObjectsUsingBlock(
+        [&](const bw::Uuid&, const std::shared_ptr<bw::ProcessBootContext>& boot, bool&) {
+          n += boot->processes().count();
+          boot->processes().enumerateKeysAndObjectsUsingBlock(countPoints);
+        });
   }
-  return n;
+  return {n, points * 16};
 }
 
 void BM_FeedProcessRecords(benchmark::State& state) {
   models();
-  std::size_t records = 0, processes = 0, heap = 0;
+  // The records and timelines alone, before any process state.
+  state.counters["peak_MB_store_loaded"] = peakMB();
+  std::size_t records = 0, processes = 0, pointBytes = 0, heap = 0;
   for (auto _ : state) {
     std::vector<std::unique_ptr<bw::ProcessSummarizer>> summarizers;
     const std::size_t before = heapInUse();
     records = feedAll(summarizers);
     heap = heapInUse() - before;
     state.PauseTiming();
-    processes = processCount(summarizers);
+    std::tie(processes, pointBytes) = processesAndPointBytes(summarizers);
     summarizers.clear();
     state.ResumeTiming();
   }
@@ -80,38 +94,61 @@ void BM_FeedProcessRecords(benchmark::State& state) {
   state.counters["processes"] = static_cast<double>(processes);
   state.counters["heap_MB"] = static_cast<double>(heap) / 1048576.0;
   state.counters["bytes_per_process"] = static_cast<double>(heap) / static_cast<double>(processes);
+  state.counters["sample_bytes_per_process"] = static_cast<double>(pointBytes) / static_cast<double>(processes);
+  state.counters["process_object_bytes"] = sizeof(bw::Process);
 }
 
 void BM_JobsAndOwnershipAtEndOfInput(benchmark::State& state) {
   models();
-  std::size_t jobs = 0, heap = 0;
+  std::size_t jobs = 0, heap = 0, processes = 0;
   for (auto _ : state) {
     state.PauseTiming();
     std::vector<std::unique_ptr<bw::ProcessSummarizer>> summarizers;
-    feedAll(summarizers);
     const std::size_t before = heapInUse();
+    feedAll(summarizers);
     state.ResumeTiming();
     for (auto& s : summarizers) s->setLastPosition(0);
     state.PauseTiming();
     heap = heapInUse() - before;
     jobs = 0;
     for (auto& s : summarizers) jobs += s->jobs().count();
+    processes = processesAndPointBytes(summarizers).first;
     summarizers.clear();
     state.ResumeTiming();
   }
   state.counters["jobs"] = static_cast<double>(jobs);
-  state.counters["added_heap_MB"] = static_cast<double>(heap) / 1048576.0;
+  // Everything the summarizers hold once jobs and owners are in place.
+  state.counters["heap_MB"] = static_cast<double>(heap) / 1048576.0;
+  state.counters["bytes_per_process"] = static_cast<double>(heap) / static_cast<double>(processes);
 }
 
-void printTopJobs(const bw::ProcessSummary& root) {
-  std::fprintf(stderr, "Ten jobs with the most CPU time (own processes only), of %zu jobs:\n",
-               root.subprocesses().size());
-  std::fprintf(stderr, "%-4s %-48s %12s %14s %10s\n", "rank", "job", "CPU s", "power score", "spawns");
-  const auto sorted = root.subprocessesSortedBySelector(&bw::ProcessSummary::compareCPUTime);
+// The ten jobs with the most CPU time over every model (system version) of
+// the store, each job's figures summed over the models by job key.
+void printTopJobs() {
+  bw::ProcessSummary all;
+  for (const auto& model : models()) {
+    const std::vector<bw::Range> whole{{0, model->timeline().duration() + 1}};
+    auto root = model->summarizeProcessesIncludingSubjobs(false, whole);
+    for (auto& [key, job] : root->subprocesses()) {
+      auto& into = all.subprocesses()[key];
+      if (!into) {
+        into = std::move(job);
+        continue;
+      }
+      into->setCpuTime(into->cpuTime() + job->cpuTime());
+      into->setIdleWakeups(into->idleWakeups() + job->idleWakeups());
+      into->setSpawns(into->spawns() + job->spawns());
+    }
+  }
+  std::fprintf(stderr, "Ten jobs with the most CPU time (own processes, %zu models), of %zu jobs:\n", models().size(),
+               all.subprocesses().size());
+  std::fprintf(stderr, "%-4s %-40s %10s %12s %14s %8s\n", "rank", "job", "CPU s", "idle wakeups", "power score",
+               "spawns");
+  const auto sorted = all.subprocessesSortedBySelector(&bw::ProcessSummary::compareCPUTime);
   for (std::size_t i = 0; i < sorted.size() && i < 10; ++i) {
     const bw::ProcessSummary& s = *sorted[i];
-    std::fprintf(stderr, "%-4zu %-48s %12.1f %14.4g %10.0f\n", i + 1, s.label() ? s.label()->c_str() : "(null)",
-                 s.cpuTime() / 1e9, s.powerScore(), s.spawns());
+    std::fprintf(stderr, "%-4zu %-40s %10.1f %12.0f %14.4g %8.0f\n", i + 1, s.label() ? s.label()->c_str() : "(null)",
+                 s.cpuTime() / 1e9, s.idleWakeups(), s.powerScore(), s.spawns());
   }
 }
 
@@ -142,11 +179,7 @@ void BM_SummarizeWholeStoreIncludingSubjobs(benchmark::State& state) {
     }
   }
   static bool printed = [] {
-    for (const auto& model : models()) {
-      const std::vector<bw::Range> whole{{0, model->timeline().duration() + 1}};
-      std::fprintf(stderr, "Model %s:\n", model->systemVersion().c_str());
-      printTopJobs(*model->summarizeProcessesIncludingSubjobs(false, whole));
-    }
+    printTopJobs();
     return true;
   }();
   (void)printed;

@@ -11,6 +11,11 @@ std::optional<AbsTime> Process::exit_time() const {
   return AbsTime{boot_, exit_};
 }
 
+void Process::shrinkToFit() {
+  for (Interpolator* curve : {&cpuTime_, &idleWakeups_, &interrupts_, &pageins_, &residentSize_, &wired_})
+    curve->shrinkToFit();
+}
+
 Value Process::objectForKeyedSubscript(const std::string& key) const {
   if (!stats_) return Value();
   auto it = stats_->find(key);

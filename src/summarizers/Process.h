@@ -85,6 +85,9 @@ class Process {
   const Interpolator& cpuTime() const { return cpuTime_; }
   const Interpolator& residentSize() const { return residentSize_; }
 
+  // Gives back the curves' spare sample capacity (at the end of input).
+  void shrinkToFit();
+
   // A curve of `self` that shares ownership of the whole process.
   static std::shared_ptr<Interpolator> share(const std::shared_ptr<Process>& self, Interpolator& (Process::*curve)()) {
     return std::shared_ptr<Interpolator>(self, &((*self).*curve)());

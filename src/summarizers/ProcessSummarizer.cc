@@ -81,6 +81,11 @@ void ProcessSummarizer::addProcessUsage(const ProcessUsage& record, ProcessBootC
 void ProcessSummarizer::setLastPosition(std::uint64_t) { createJobsFromProcesses(); }
 
 void ProcessSummarizer::createJobsFromProcesses() {
+  // No sample comes after this: the curves keep only what they hold.
+  boots_.enumerateKeysAndObjectsUsingBlock([](const Uuid&, const std::shared_ptr<ProcessBootContext>& boot, bool&) {
+    boot->processes().enumerateKeysAndObjectsUsingBlock(
+        [](std::uint64_t, const std::shared_ptr<Process>& p, bool&) { p->shrinkToFit(); });
+  });
   boots_.enumerateKeysAndObjectsUsingBlock(
       [this](const Uuid&, const std::shared_ptr<ProcessBootContext>& boot, bool&) { boot->createJobs(jobs_); });
   boots_.enumerateKeysAndObjectsUsingBlock(
