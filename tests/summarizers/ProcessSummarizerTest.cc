@@ -93,6 +93,7 @@ TEST_F(ProcessAccounting, JobsGroupCleanedNamesAndPluginDisplayNamesAndLeaveOutG
   EXPECT_EQ(process(s, 10)->sharedLabel(), process(s, 11)->sharedLabel());  // one copy per job name
   Job& foo = s.jobs().objectForKey("Foo");
   EXPECT_EQ(*foo.label(), "Foo");
+  EXPECT_EQ(foo.sharedLabel(), process(s, 10)->sharedLabel());
   EXPECT_EQ(process(s, 10)->job(), &foo);
   EXPECT_EQ(process(s, 12)->job(), process(s, 14)->job());
   EXPECT_TRUE(logged("Incomplete data: PID 16 [(null)] died before we could get its Mach-O UUID."));
