@@ -98,6 +98,13 @@ class DataSet {
   std::vector<Range>& continuousRanges() { return continuousRanges_; }
   void setContinuousRanges(std::vector<Range> ranges) { continuousRanges_ = std::move(ranges); }
 
+  // Gives back the lists' spare capacity, for sets that are complete.
+  void shrinkToFit() {
+    positions_.shrink_to_fit();
+    values_.shrink_to_fit();
+    continuousRanges_.shrink_to_fit();
+  }
+
   // "<DataSet: ADDRESS <(" then one "POSITION, VALUE" line per sample, the
   // value printed as an unsigned integer, then ")>>".
   std::string debugDescription() const;

@@ -65,6 +65,8 @@ class Interpolator {
   // First sample's position; throws kRangeException while empty.
   std::uint64_t minPosition() const { return dataSet_.minPosition(); }
   const DataSet& dataSet() const { return dataSet_; }
+  // Gives back spare sample capacity once no more samples will come.
+  void shrinkToFit() { dataSet_.shrinkToFit(); }
 
   // "<CLASS: ADDRESS <(\n_dataSet = DATASET\n)>>"
   std::string debugDescription() const;

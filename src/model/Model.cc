@@ -6,6 +6,7 @@
 #include "store/RecordPool.h"
 #include "summarizers/ModelSummarizers.h"
 #include "summarizers/PowerSummary.h"
+#include "summarizers/ProcessSummarizer.h"
 
 namespace bw {
 
@@ -125,6 +126,21 @@ std::vector<std::unique_ptr<Summary>> Model::summarizeTop(const std::string& key
 std::vector<std::unique_ptr<Summary>> Model::sortedPowerSummariesInRanges(const std::vector<Range>& ranges) const {
   return summarizeTop("Power", ranges,
                       [](const Summary& s) { return static_cast<const PowerSummary&>(s).avgPowerDenom() > 0.0; });
+}
+
+ProcessSummarizer* Model::processes() const { return dynamic_cast<ProcessSummarizer*>(summarizer("Processes")); }
+
+void Model::summarizeProcesses(ProcessSummary& summary, bool includingSubjobs, const AbsRange& range) const {
+  processes()->summarizeProcesses(summary, includingSubjobs, {range});
+}
+
+void Model::summarizeProcesses(ProcessSummary& summary, bool includingSubjobs, const Range& range) const {
+  processes()->summarizeProcesses(summary, includingSubjobs, timeline_->absoluteRangesForRelativeRanges({range}));
+}
+
+std::unique_ptr<ProcessSummary> Model::summarizeProcessesIncludingSubjobs(bool includingSubjobs,
+                                                                          const std::vector<Range>& ranges) const {
+  return processes()->summarizeJobs(includingSubjobs, absoluteTimeRangesForRelativeRanges(ranges));
 }
 
 std::uint64_t Model::wallTimeForRelative(std::uint64_t position) const {

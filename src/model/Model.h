@@ -17,6 +17,8 @@
 
 namespace bw {
 
+class ProcessSummarizer;
+class ProcessSummary;
 class RecordPool;
 
 class Model {
@@ -63,6 +65,16 @@ class Model {
   double averageCStateResidencyForRanges(const std::vector<Range>& ranges) const;
   // The same over the positions within `ranges` where all `keys` held.
   double averageCStateResidencyForState(const std::vector<std::string>& keys, const std::vector<Range>& ranges) const;
+
+  // The "Processes" summarizer, or null.
+  ProcessSummarizer* processes() const;
+  // Job summaries into `summary` over one absolute range, over the pieces
+  // of one relative range, or into a new summary over the pieces of
+  // `ranges`; `includingSubjobs` adds what each job owns to its line.
+  void summarizeProcesses(ProcessSummary& summary, bool includingSubjobs, const AbsRange& range) const;
+  void summarizeProcesses(ProcessSummary& summary, bool includingSubjobs, const Range& range) const;
+  std::unique_ptr<ProcessSummary> summarizeProcessesIncludingSubjobs(bool includingSubjobs,
+                                                                     const std::vector<Range>& ranges) const;
 
   std::uint64_t wallTimeForRelative(std::uint64_t position) const;
   std::optional<AbsTime> absoluteTimeForRelative(std::uint64_t position) const;

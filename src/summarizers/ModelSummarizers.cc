@@ -4,6 +4,7 @@
 #include "summarizers/CPUSummarizer.h"
 #include "summarizers/IOSummarizer.h"
 #include "summarizers/PowerStateSummarizers.h"
+#include "summarizers/ProcessSummarizer.h"
 #include "summarizers/StandbySummarizer.h"
 
 namespace bw {
@@ -26,6 +27,7 @@ std::vector<std::pair<std::string, std::unique_ptr<Summarizer>>> makeModelSummar
   add("CPU", std::make_unique<CPUSummarizer>());
   add("IO", std::make_unique<IOSummarizer>());
   add("Power", std::make_unique<BatterySummarizer>());
+  add("Processes", std::make_unique<ProcessSummarizer>());
   add("Standby", std::make_unique<StandbySummarizer>());
   return all;
 }

@@ -1,0 +1,71 @@
+#include <gtest/gtest.h>
+
+#include "Records/LogStartsV1.h"
+#include "cli/Options.h"
+#include "model/Model.h"
+#include "summarizers/ProcessRecords.h"
+#include "summarizers/ProcessSummarizer.h"
+#include "time/BootTimeline.h"
+
+namespace bw {
+namespace {
+
+using test::Sample;
+
+// One boot: App (10) runs from 0 to 3000 and owns a tool (11) that runs
+// from 1500 to 2000.
+class ModelProcesses : public ::testing::Test {
+ protected:
+  ModelProcesses() {
+    header.setVersion("1");
+    header.setAbsoluteTime(0);
+    header.setWallTime(BootTimeline::kClockSetWallTime + 1000000);
+    header.setSystemVersion("23A344");
+    for (const Sample& s : {
+             Sample{.uniqueid = 10, .at = 1000, .name = "App", .responsible = 10, .cpuMs = 10},
+             Sample{.uniqueid = 11, .at = 2000, .status = 0, .name = "tool", .parent = 10, .cpuMs = 5, .start = 1500},
+             Sample{.uniqueid = 10, .at = 3000, .status = 0, .name = "App", .responsible = 10, .cpuMs = 30},
+         })
+      usages.push_back(test::processUsage(s));
+    std::vector<Record*> records{&header};
+    for (ProcessUsage& u : usages) records.push_back(&u);
+    std::vector<std::unique_ptr<Timeline>> boots;
+    boots.push_back(std::make_unique<BootTimeline>(test::boot(1), records));
+    model = std::make_unique<Model>(Timeline::timelineWithTimelines(std::move(boots)), "23A344");
+    Options options;
+    options.setMode(kModeDashboard);
+    model->processEventsWithDomains({}, options);
+  }
+  double cpuMs(const ProcessSummary& root, const char* job) { return root.subprocesses().at(job)->cpuTime() / 1e6; }
+
+  LogStartsV1 header;
+  std::vector<ProcessUsage> usages;
+  std::unique_ptr<Model> model;
+};
+
+TEST_F(ModelProcesses, TheThreeOperationsSummarizeJobsOverRelativeAndAbsoluteRanges) {
+  ASSERT_NE(model->processes(), nullptr);
+  EXPECT_EQ(model->processes(), model->summarizer("Processes"));
+
+  const std::vector<Range> whole{{0, 3001}};
+  auto plain = model->summarizeProcessesIncludingSubjobs(false, whole);
+  EXPECT_EQ(plain->cpuTime(), 35e6);
+  EXPECT_EQ(cpuMs(*plain, "App"), 30);
+  auto with = model->summarizeProcessesIncludingSubjobs(true, whole);
+  EXPECT_EQ(cpuMs(*with, "App"), 35);
+  EXPECT_EQ(with->cpuTime(), 35e6);
+
+  ProcessSummary relative;
+  model->summarizeProcesses(relative, true, Range{1000, 1000});
+  EXPECT_EQ(cpuMs(relative, "App"), 15);  // 10 of its own, the tool's 5
+  EXPECT_EQ(relative.spawns(), 1);        // the tool
+
+  ProcessSummary absolute;
+  model->summarizeProcesses(absolute, false, AbsRange::rangeWithBoot(test::boot(1), 0, 1000));
+  EXPECT_EQ(cpuMs(absolute, "App"), 10);
+  EXPECT_EQ(cpuMs(absolute, "tool"), 0);
+  EXPECT_EQ(absolute.stillrunning(), 1u);
+}
+
+}  // namespace
+}  // namespace bw
