@@ -17,6 +17,7 @@
 
 namespace bw {
 
+class DeviceSummarizer;
 class Options;
 class RecordPool;
 
@@ -60,6 +61,14 @@ class Model {
   std::vector<std::unique_ptr<Summary>> summarizeTop(const std::string& key, const std::vector<Range>& ranges,
                                                      const std::function<bool(const Summary&)>& filter) const;
   std::vector<std::unique_ptr<Summary>> sortedPowerSummariesInRanges(const std::vector<Range>& ranges) const;
+  // Memory stretches with a duration, heaviest swapping first.
+  std::vector<std::unique_ptr<Summary>> sortedMemorySummariesInRanges(const std::vector<Range>& ranges) const;
+  // Fan stretches with a duration and more than 5 annoying or very annoying
+  // samples, loudest first.
+  std::vector<std::unique_ptr<Summary>> sortedFanSummariesInRanges(const std::vector<Range>& ranges) const;
+
+  // The "Devices" summarizer, or null.
+  const DeviceSummarizer* devices() const;
 
   std::uint64_t wallTimeForRelative(std::uint64_t position) const;
   std::optional<AbsTime> absoluteTimeForRelative(std::uint64_t position) const;
