@@ -1,9 +1,10 @@
 #pragma once
 // Writes a `Value` as an XML property list: the form the report state and
 // the usage file are kept in. `readPropertyList` reads it back to an equal
-// value, except that unsigned integers come back signed and a null value
-// (which property lists cannot hold) is left out of its dictionary or
-// array.
+// value, except that integers come back signed (an unsigned value above
+// 2^63 - 1 is written as its negative two's-complement reading), dates keep
+// whole seconds only, and a null value (which property lists cannot hold)
+// is left out of its dictionary or array.
 #include <string>
 
 #include "base/Value.h"

@@ -53,7 +53,6 @@ TEST(BrightnessSummarizer, LevelsHoldUntilTheNextRecordAndAverageByTime) {
   }
   Summary summary;
   s.summarize(summary, AbsRange::rangeWithBoot(boot(1), 1000, 1000 + 4 * kMinute));
-  EXPECT_DOUBLE_EQ(sumOf(summary, "BrightnessNumer") / sumOf(summary, "BrightnessDenom"), 87.5);
   s.summarize(summary, AbsRange::rangeWithBoot(boot(2), 0, kMinute));  // an unknown boot adds zeros
   EXPECT_EQ(summary.storage().at("BrightnessDenom").size(), 2u);
   EXPECT_DOUBLE_EQ(sumOf(summary, "BrightnessNumer") / sumOf(summary, "BrightnessDenom"), 87.5);

@@ -45,6 +45,7 @@ TEST(MemorySummarizer, RangeHoldsCounterDeltasAndLevelMaximaInBytes) {
   EXPECT_EQ(s.ranges(), (std::vector<Range>{{1000, 1000}, {2000, 1000}}));
 
   const MemorySummary whole = summarize(s, 1000, 3000);
+  const MemorySummary second = summarize(s, 2500, 3000);
   EXPECT_EQ(whole.duration(), 2000u);
   EXPECT_EQ(whole.memorySize(), 8ull << 30);
   EXPECT_TRUE(whole.swapDeviceIsSSD());
@@ -58,7 +59,6 @@ TEST(MemorySummarizer, RangeHoldsCounterDeltasAndLevelMaximaInBytes) {
         Expected{"Wired", 3 * 10 * 4096.0, 2.5 * 10 * 4096}, Expected{"Compressed", 3 * 20 * 4096.0, 2.5 * 20 * 4096},
         Expected{"Free", 3 * 30 * 4096.0, 2.5 * 30 * 4096}, Expected{"Graphics Resident", 3000, 2500}}) {
     SCOPED_TRACE(e.key);
-    const MemorySummary second = summarize(s, 2500, 3000);
     ASSERT_EQ(whole.storage().at(e.key).size(), 1u);
     EXPECT_DOUBLE_EQ(whole.storage().at(e.key)[0].doubleValue(), e.whole);
     EXPECT_DOUBLE_EQ(second.storage().at(e.key)[0].doubleValue(), e.second);
