@@ -3,6 +3,8 @@
 #include <gtest/gtest.h>
 
 #include "Events.h"
+#include "Records/FanState.h"
+#include "ResourceModel.h"
 #include "model/Model.h"
 #include "model/ModelUsage.h"
 #include "store/PropertyListReader.h"
@@ -101,6 +103,19 @@ TEST_F(Usage, FileRoundTripsThroughAnXmlPropertyListDroppingOldDaysAndKeepingUnk
   summarizeUsage(reread, YearMonthDay{2026, 3, 11}, day, model);  // through the model's own summarizer
   EXPECT_EQ(reread.size(), 3u);                                   // 2026-02-03 is now too old
   EXPECT_TRUE(reread.count("2026-03-11") && reread.count("Version"));
+}
+
+TEST(UsageDay, TheDayIsTheLocalDayOfTheMiddleOfTheRanges) {
+  std::vector<std::unique_ptr<Record>> records;
+  records.push_back(test::at<FanState>(2 * kHour, [](FanState&) {}));
+  test::ResourceModel built(std::move(records));  // awake from 0 to 2 h, wall times from 1700000000000
+  Dictionary usage;
+  summarizeUsage(usage, {}, built.model());
+  EXPECT_TRUE(usage.empty());
+  summarizeUsage(usage, {{0, kHour / 2}, {kHour, kHour}}, built.model());
+  const std::string day = UsageSummarizer::dayKey(yearMonthDayFromDate(Date::fromMilliseconds(1700000000000 + kHour)));
+  ASSERT_EQ(usage.count(day), 1u);
+  EXPECT_EQ(usage.at(day).get<Dictionary>().at("Wake"), Value(5400));
 }
 
 }  // namespace
