@@ -4,6 +4,8 @@
 
 #include "base/Exception.h"
 #include "store/RecordPool.h"
+#include "summarizers/DeviceSummarizer.h"
+#include "summarizers/FanSummarizer.h"
 #include "summarizers/ModelSummarizers.h"
 #include "summarizers/PowerSummary.h"
 #include "summarizers/ProcessSummarizer.h"
@@ -142,6 +144,18 @@ std::unique_ptr<ProcessSummary> Model::summarizeProcessesIncludingSubjobs(bool i
                                                                           const std::vector<Range>& ranges) const {
   return processes()->summarizeJobs(includingSubjobs, absoluteTimeRangesForRelativeRanges(ranges));
 }
+std::vector<std::unique_ptr<Summary>> Model::sortedMemorySummariesInRanges(const std::vector<Range>& ranges) const {
+  return summarizeTop("Memory", ranges, [](const Summary& s) { return s.duration() != 0; });
+}
+
+std::vector<std::unique_ptr<Summary>> Model::sortedFanSummariesInRanges(const std::vector<Range>& ranges) const {
+  return summarizeTop("Fan", ranges, [](const Summary& s) {
+    const auto& fan = static_cast<const FanSummary&>(s);
+    return fan.duration() != 0 && fan.annoying_samples() + fan.veryannoying_samples() > 5;
+  });
+}
+
+const DeviceSummarizer* Model::devices() const { return dynamic_cast<const DeviceSummarizer*>(summarizer("Devices")); }
 
 std::uint64_t Model::wallTimeForRelative(std::uint64_t position) const {
   return timeline_->wallTimeForRelative(position);

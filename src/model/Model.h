@@ -19,6 +19,7 @@ namespace bw {
 
 class ProcessSummarizer;
 class ProcessSummary;
+class DeviceSummarizer;
 class RecordPool;
 
 class Model {
@@ -75,6 +76,14 @@ class Model {
   void summarizeProcesses(ProcessSummary& summary, bool includingSubjobs, const Range& range) const;
   std::unique_ptr<ProcessSummary> summarizeProcessesIncludingSubjobs(bool includingSubjobs,
                                                                      const std::vector<Range>& ranges) const;
+  // Memory stretches with a duration, heaviest swapping first.
+  std::vector<std::unique_ptr<Summary>> sortedMemorySummariesInRanges(const std::vector<Range>& ranges) const;
+  // Fan stretches with a duration and more than 5 annoying or very annoying
+  // samples, loudest first.
+  std::vector<std::unique_ptr<Summary>> sortedFanSummariesInRanges(const std::vector<Range>& ranges) const;
+
+  // The "Devices" summarizer, or null.
+  const DeviceSummarizer* devices() const;
 
   std::uint64_t wallTimeForRelative(std::uint64_t position) const;
   std::optional<AbsTime> absoluteTimeForRelative(std::uint64_t position) const;

@@ -82,7 +82,10 @@ Value toValue(plist_t node) {
 std::optional<Value> readPropertyList(const std::string& path) {
   std::ifstream in(path, std::ios::binary);
   if (!in) return std::nullopt;
-  std::string bytes((std::istreambuf_iterator<char>(in)), std::istreambuf_iterator<char>());
+  return propertyListFromBytes(std::string((std::istreambuf_iterator<char>(in)), std::istreambuf_iterator<char>()));
+}
+
+std::optional<Value> propertyListFromBytes(const std::string& bytes) {
   if (bytes.empty() || bytes.size() > UINT32_MAX) return std::nullopt;
   plist_t root = nullptr;
   plist_from_memory(bytes.data(), static_cast<std::uint32_t>(bytes.size()), &root);

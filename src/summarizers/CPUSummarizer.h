@@ -33,7 +33,7 @@
 #include "accum/Interpolator.h"
 #include "accum/SawtoothInterpolator.h"
 #include "base/Uuid.h"
-#include "model/Summarizer.h"
+#include "framework/Summarizer.h"
 #include "summarizers/CPUSummary.h"
 
 namespace bw {

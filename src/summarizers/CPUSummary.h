@@ -12,7 +12,7 @@
 #include <map>
 #include <optional>
 
-#include "model/Summary.h"
+#include "framework/Summary.h"
 
 namespace bw {
 

@@ -13,8 +13,8 @@
 //   networkBytesIn "Bytes Received"       networkBytesOut "Bytes Sent"
 #include <memory>
 
-#include "model/Summarizer.h"
-#include "model/SummarizerContext.h"
+#include "framework/Summarizer.h"
+#include "framework/SummarizerContext.h"
 #include "summarizers/IOSummary.h"
 
 namespace bw {

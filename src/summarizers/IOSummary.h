@@ -5,7 +5,7 @@
 #include <array>
 #include <string>
 
-#include "model/Summary.h"
+#include "framework/Summary.h"
 
 namespace bw {
 

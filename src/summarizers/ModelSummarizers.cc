@@ -1,11 +1,17 @@
 #include "summarizers/ModelSummarizers.h"
 
 #include "summarizers/BatterySummarizer.h"
+#include "summarizers/BrightnessSummarizer.h"
 #include "summarizers/CPUSummarizer.h"
+#include "summarizers/DeviceSummarizer.h"
+#include "summarizers/FanSummarizer.h"
 #include "summarizers/IOSummarizer.h"
+#include "summarizers/MemorySummarizer.h"
+#include "summarizers/PSRSummarizer.h"
 #include "summarizers/PowerStateSummarizers.h"
 #include "summarizers/ProcessSummarizer.h"
 #include "summarizers/StandbySummarizer.h"
+#include "summarizers/UsageSummarizer.h"
 
 namespace bw {
 
@@ -29,6 +35,12 @@ std::vector<std::pair<std::string, std::unique_ptr<Summarizer>>> makeModelSummar
   add("Power", std::make_unique<BatterySummarizer>());
   add("Processes", std::make_unique<ProcessSummarizer>());
   add("Standby", std::make_unique<StandbySummarizer>());
+  add("Memory", std::make_unique<MemorySummarizer>());
+  add("Backlight", std::make_unique<BrightnessSummarizer>());
+  add("PanelSelfRefresh", std::make_unique<PSRSummarizer>());
+  add("Fan", std::make_unique<FanSummarizer>());
+  add("Devices", std::make_unique<DeviceSummarizer>());
+  add("Usage", std::make_unique<UsageSummarizer>());
   return all;
 }
 

@@ -25,7 +25,7 @@
 #include <vector>
 
 #include "accum/HashFactory.h"
-#include "model/Summarizer.h"
+#include "framework/Summarizer.h"
 #include "summarizers/Job.h"
 #include "summarizers/JobName.h"
 #include "summarizers/ProcessBootContext.h"

@@ -11,7 +11,7 @@
 #include <unordered_map>
 #include <vector>
 
-#include "model/Summary.h"
+#include "framework/Summary.h"
 
 namespace bw {
 

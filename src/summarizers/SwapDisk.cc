@@ -88,6 +88,7 @@ SwapDiskInfo lookUpSwapDisk(const std::string& root) {
 
   const fs::path diskDir = fs::path(root + "/sys/block") / disk;
   if (readAttribute(diskDir / "queue" / "rotational") != "0") return info;
+  info.solidState = true;
   info.productName = readAttribute(diskDir / "device" / "model");
   info.productRevisionLevel = readAttribute(diskDir / "device" / "rev");
   if (!info.productRevisionLevel) info.productRevisionLevel = readAttribute(diskDir / "device" / "firmware_rev");

@@ -9,6 +9,8 @@
 namespace bw {
 
 struct SwapDiskInfo {
+  // The disk does not rotate.
+  bool solidState = false;
   std::optional<std::string> productName;
   std::optional<std::string> productRevisionLevel;
 };

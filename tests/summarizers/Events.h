@@ -19,6 +19,14 @@ inline void feed(Summarizer& s, const Record& r, std::uint64_t position, std::ui
   s.addEvent(r, position, AbsTime{boot(bootNumber), position}, 0);
 }
 
+// Feeds `r` with its own absolute time set to `position`, for summarizers
+// that keep per-boot series by the record's time.
+template <class R>
+void feedAt(Summarizer& s, R r, std::uint64_t position, std::uint8_t bootNumber = 1) {
+  r.setAbsoluteTime(position);
+  feed(s, r, position, bootNumber);
+}
+
 // A record of class R after `set` has filled it in.
 template <class R, class F>
 R make(F set) {

@@ -86,10 +86,12 @@ TEST_F(SwapDiskLookup, PartitionOnASolidStateDiskNamesTheParentDiskARotatingOneN
   const SwapDiskInfo info = lookUp();
   EXPECT_EQ(info.productName, "Fast Disk 1000");
   EXPECT_EQ(info.productRevisionLevel, "FW12");
+  EXPECT_TRUE(info.solidState);
   std::filesystem::remove(root / "sys/block/sdz/device/rev");
   EXPECT_EQ(lookUp().productRevisionLevel, "other");
   root.write("sys/block/sdz/queue/rotational", "1\n");  // a rotating disk answers nothing, silently
   EXPECT_FALSE(lookUp().productName);
+  EXPECT_FALSE(lookUp().solidState);
   EXPECT_TRUE(platform.assumptionLogLines.empty());
 }
 
