@@ -1,10 +1,7 @@
 #include "cli/ModelLoader.h"
 
-#include "base/Console.h"
 #include "cli/Options.h"
 #include "model/Model.h"
-#include "store/RecordReader.h"
-#include "time/BootSequencer.h"
 
 namespace bw {
 
@@ -32,24 +29,6 @@ bool feedsSummarizers(const Options& options) {
   return options.mode() != kModeDump && options.mode() != kModeShowEvents;
 }
 
-FileList runFileList(const StoreQuery& query) {
-  FileList files = statsFileList(query);
-  if (query.fromPath && files.empty()) exitWithMessage(66, "--from path contained no Brindlewick trace files.");
-  return files;
-}
-
-std::vector<std::unique_ptr<Model>> loadModels(const Options& options) {
-  const StoreQuery query = storeQuery(options);
-  const FileList files = runFileList(query);
-  RecordsByBoot read = readStatsFiles(std::vector<std::string>(files.begin(), files.end()), query);
-  auto pool = std::make_shared<RecordPool>(std::move(read.pool));
-  std::vector<std::unique_ptr<Model>> models;
-  for (auto& [version, timeline] : sequenceBoots(read.boots)) {
-    auto model = std::make_unique<Model>(std::move(timeline), version);
-    model->retainRecords(pool);
-    models.push_back(std::move(model));
-  }
-  return models;
-}
+std::vector<std::unique_ptr<Model>> loadModels(const Options& options) { return loadModels(storeQuery(options)); }
 
 }  // namespace bw

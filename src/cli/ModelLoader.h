@@ -6,8 +6,7 @@
 #include <vector>
 
 #include "domains/DomainSpec.h"
-#include "store/StatsFileList.h"
-#include "store/StoreQuery.h"
+#include "model/ModelLoading.h"
 
 namespace bw {
 
@@ -20,12 +19,7 @@ DomainSpec domainSpec(const Options& options);
 // need only the domains.
 bool feedsSummarizers(const Options& options);
 
-// The stats files of the run. A `--from` directory without any ends the run
-// with "--from path contained no Brindlewick trace files." (status 66).
-FileList runFileList(const StoreQuery& query);
-
-// Reads the store the options select and builds one model per system
-// version, each holding its boots in sequence; nothing is fed yet.
+// loadModels(storeQuery(options)).
 std::vector<std::unique_ptr<Model>> loadModels(const Options& options);
 
 }  // namespace bw

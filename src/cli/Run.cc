@@ -8,6 +8,7 @@
 #include "cli/OptionParser.h"
 #include "cli/Options.h"
 #include "cli/RecordModes.h"
+#include "service/AnalysisService.h"
 
 namespace bw {
 
@@ -41,6 +42,12 @@ void dispatch(const Options& options) {
       break;
     case kModeShowBattery:
       runBatteryPlot(options);
+      break;
+    case kModeService:
+      runAnalysisService(ServiceSettings{options.from_path()});
+      break;
+    case kModeServiceDebug:
+      runServiceDebug(storeQuery(options));
       break;
     default:
       notAvailableYet();

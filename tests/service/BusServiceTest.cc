@@ -1,0 +1,302 @@
+#include <grp.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <gtest/gtest.h>
+
+#include <atomic>
+#include <thread>
+
+#include "base/Platform.h"
+#include "cli/Run.h"
+#include "service/AnalysisService.h"
+#include "service/PrivateBus.h"
+#include "service/SamplerPair.h"
+#include "service/ServiceStores.h"
+#include "support/FakePlatform.h"
+#include "support/RunTool.h"
+
+namespace bw {
+namespace {
+
+using test::CallResult;
+using test::PrivateBus;
+using test::ServiceProcess;
+
+const Uuid kBoot = *Uuid::parse("5E5E5E5E-0000-0000-0000-00000000000A");
+constexpr std::uint64_t kWallStart = 1700000000000;
+constexpr std::uint64_t kDataEnd = kWallStart + 94000;  // the battery store's last record
+
+template <class T>
+const T& get(const MessageDictionary& d, const std::string& key) {
+  const T* v = d.at(key).getIf<T>();
+  if (!v) throw std::runtime_error(key + " came as " + signatureOf(d.at(key)));
+  return *v;
+}
+
+// The service as `brindlewick --debug --xpc --from STORE`, run in a child of
+// the test with a fixed clock and boot.
+int serveWithClock(const std::string& store, std::uint64_t nowMs) {
+  test::FakePlatform fake;
+  fake.bootUuid = kBoot;
+  fake.nowMicros = static_cast<std::int64_t>(nowMs) * 1000;
+  fake.absoluteMs = 95000;
+  const char* args[] = {"brindlewick", "--debug", "--xpc", "--from", store.c_str(), nullptr};
+  return runMain(5, const_cast<char**>(args));
+}
+
+class BusService : public ::testing::Test {
+ protected:
+  void SetUp() override {
+    if (!PrivateBus::available()) GTEST_SKIP() << "no dbus-daemon";
+    bus = std::make_unique<PrivateBus>();
+    test::writeBatteryStore(store / "battery.stats", kBoot, "6.1.0-test", kWallStart);
+    test::writeJobStore(store / "jobs.stats", kBoot, "6.1.0-test", kWallStart, test::serviceJobs());
+    client = bus->connect();
+  }
+  void TearDown() override { sd_bus_flush_close_unref(client); }
+  std::unique_ptr<ServiceProcess> serve(std::uint64_t nowMs) {
+    const std::string dir = store.path();
+    return std::make_unique<ServiceProcess>(*bus, [dir, nowMs] { return serveWithClock(dir, nowMs); });
+  }
+  CallResult call(const MessageDictionary& request) { return test::callRequest(client, request); }
+
+  test::TempDir store;
+  std::unique_ptr<PrivateBus> bus;
+  sd_bus* client = nullptr;
+};
+
+TEST_F(BusService, AnswersEachRequestTypeWithTheWireTypes) {
+  auto service = serve(kDataEnd + 10000);
+  ASSERT_TRUE(service->running()) << service->err();
+
+  CallResult graph = call({{"request_type", "battery_charge_graph"}});
+  ASSERT_EQ(graph.error, "");
+  EXPECT_EQ(get<std::vector<std::uint64_t>>(graph.reply, "charge_times"),
+            (std::vector<std::uint64_t>{103, 43, 34, 24, 14}));
+  EXPECT_EQ(get<std::vector<double>>(graph.reply, "charge_levels").size(), 5u);
+  EXPECT_EQ(get<std::vector<std::int64_t>>(graph.reply, "sleep_states"), (std::vector<std::int64_t>{0, 1}));
+  EXPECT_EQ(get<std::vector<bool>>(graph.reply, "battery_states"), (std::vector<bool>{true, false}));
+  EXPECT_EQ(get<std::uint64_t>(graph.reply, "time_since_full_charge"), 10u);
+
+  CallResult jobs = call({{"request_type", "top_launchd_jobs"}, {"count", std::uint64_t{0}}});
+  ASSERT_EQ(jobs.error, "");
+  EXPECT_EQ(get<std::uint64_t>(jobs.reply, "report_duration"), 94u);
+  const auto& launchd = get<MessageDictionary>(jobs.reply, "launchd_jobs");
+  EXPECT_EQ(get<std::vector<std::string>>(launchd, "labels"),
+            (std::vector<std::string>{"alpha", "beta", "gamma", "j9", "j8", "j7", "j6", "j5", "j4", "j3"}));
+  OptionalStrings names(10);
+  names[1] = "Beta App";
+  EXPECT_EQ(get<OptionalStrings>(launchd, "display_names"), names);  // aas: empty inner arrays for none
+  EXPECT_EQ(get<std::vector<std::uint64_t>>(launchd, "powerscore").size(), 10u);
+  EXPECT_EQ(get<std::vector<std::uint64_t>>(launchd, "runtime").size(), 10u);
+  EXPECT_EQ(get<std::vector<std::uint64_t>>(launchd, "instances_still_running").size(), 10u);
+
+  CallResult examined = call({{"request_type", "process_usage"},
+                              {"count", std::uint64_t{3}},
+                              {"powerscore_greater_than", std::uint64_t{60000000}}});
+  EXPECT_EQ(get<std::vector<std::string>>(get<MessageDictionary>(examined.reply, "launchd_jobs"), "labels"),
+            std::vector<std::string>{"alpha"});
+
+  EXPECT_EQ(call({}).reply, (MessageDictionary{{"error", "Expected string request_type in request"}}));
+  EXPECT_EQ(call({{"request_type", std::int64_t{7}}}).reply,
+            (MessageDictionary{{"error", "Expected string request_type in request"}}));
+  EXPECT_EQ(call({{"request_type", "top_jobs"}}).reply,
+            (MessageDictionary{{"error", "Unrecognized request_type in request"}}));
+
+  // A call with another signature is refused by the bus layer; the service goes on.
+  sd_bus_error error = SD_BUS_ERROR_NULL;
+  sd_bus_message* reply = nullptr;
+  EXPECT_LT(sd_bus_call_method(client, kAnalysisName, kAnalysisPath, kAnalysisInterface, "Request", &error, &reply, "s",
+                               "battery_charge_graph"),
+            0);
+  EXPECT_STREQ(error.name, SD_BUS_ERROR_INVALID_ARGS);
+  sd_bus_error_free(&error);
+  sd_bus_message_unref(reply);
+  EXPECT_EQ(call({{"request_type", "battery_charge_graph"}}).error, "");
+  EXPECT_TRUE(service->running());
+}
+
+TEST_F(BusService, ADataEndFiveSecondsAheadEndsTheService) {
+  {
+    auto service = serve(kDataEnd - 4999);
+    ASSERT_TRUE(service->running()) << service->err();
+    CallResult graph = call({{"request_type", "battery_charge_graph"}});
+    EXPECT_EQ(graph.error, "");
+    EXPECT_EQ(get<std::uint64_t>(graph.reply, "time_since_full_charge"), 0u);
+  }
+  auto service = serve(kDataEnd - 5000);
+  ASSERT_TRUE(service->running()) << service->err();
+  CallResult graph = call({{"request_type", "battery_charge_graph"}});
+  EXPECT_NE(graph.error, "");
+  EXPECT_EQ(service->wait(), 70);
+  EXPECT_NE(service->err().find("brindlewick: *** uncaught exception NSInternalInconsistencyException: wall time was "
+                                "less than last wall time in data\n"),
+            std::string::npos)
+      << service->err();
+}
+
+// Calls from a child process that runs as uid/gid 65534 with `groups`.
+CallResult callAsNobody(const PrivateBus& bus, const MessageDictionary& request, std::vector<gid_t> groups) {
+  int fds[2];
+  if (pipe(fds) != 0) throw std::runtime_error("pipe");
+  pid_t pid = fork();
+  if (pid == 0) {
+    close(fds[0]);
+    if (setgroups(groups.size(), groups.data()) != 0 || setgid(65534) != 0 || setuid(65534) != 0) _exit(2);
+    sd_bus* b = bus.connect();
+    CallResult r = test::callRequest(b, request);
+    const std::string text = r.error.empty() ? busText(r.reply) : "error " + r.error;
+    (void)!write(fds[1], text.data(), text.size());
+    _exit(0);
+  }
+  close(fds[1]);
+  std::string text;
+  char buf[4096];
+  ssize_t n;
+  while ((n = read(fds[0], buf, sizeof buf)) > 0) text.append(buf, static_cast<std::size_t>(n));
+  close(fds[0]);
+  waitpid(pid, nullptr, 0);
+  CallResult result;
+  result.error = text.rfind("error ", 0) == 0 ? text : "";
+  if (result.error.empty()) result.reply = {{"text", text}};
+  return result;
+}
+
+TEST_F(BusService, OnlyRootAndTheAdmGroupGetTheJobReport) {
+  auto service = serve(kDataEnd + 10000);
+  ASSERT_TRUE(service->running()) << service->err();
+  const MessageDictionary jobs{{"request_type", "top_launchd_jobs"}};
+  EXPECT_EQ(callAsNobody(*bus, jobs, {}).reply,
+            (MessageDictionary{{"text", busText(MessageDictionary{{"error", "Not permitted"}})}}));
+  const std::string graph =
+      get<std::string>(callAsNobody(*bus, {{"request_type", "battery_charge_graph"}}, {}).reply, "text");
+  EXPECT_EQ(graph.rfind("a{sv} 7 \"battery_states\" ab 2 true false", 0), 0u) << graph;
+
+  const group* adm = getgrnam("adm");
+  if (!adm) GTEST_SKIP() << "no group adm";
+  const std::string allowed = get<std::string>(callAsNobody(*bus, jobs, {adm->gr_gid}).reply, "text");
+  EXPECT_NE(allowed.find("\"labels\" as 10 \"alpha\""), std::string::npos) << allowed;
+}
+
+// A stand-in for the recorder: owns the sampler's name and, on
+// SampleProcessesNow, writes a store file with a heavy job "fresh" and
+// answers SampleProcessesDone (unless told to stay silent).
+class FakeSampler {
+ public:
+  FakeSampler(const PrivateBus& bus, std::string storeFile, bool answers)
+      : storeFile_(std::move(storeFile)), answers_(answers) {
+    bus_ = bus.connect();
+    sd_bus_match_signal(bus_, nullptr, nullptr, nullptr, kAnalysisInterface, "SampleProcessesNow", onNow, this);
+    if (sd_bus_request_name(bus_, SamplerPair::kSamplerName, 0) < 0) throw std::runtime_error("no sampler name");
+    thread_ = std::thread([this] {
+      while (!stop_) {
+        if (sd_bus_process(bus_, nullptr) > 0) continue;
+        sd_bus_wait(bus_, 20000);
+      }
+    });
+  }
+  ~FakeSampler() {
+    stop_ = true;
+    thread_.join();
+    sd_bus_flush_close_unref(bus_);
+  }
+  int requests() const { return requests_; }
+
+ private:
+  static int onNow(sd_bus_message*, void* self, sd_bus_error*) {
+    auto* s = static_cast<FakeSampler*>(self);
+    ++s->requests_;
+    test::writeJobStore(s->storeFile_, kBoot, "6.1.0-test", kWallStart, {{"fresh", 1000}});
+    if (s->answers_)
+      sd_bus_emit_signal(s->bus_, "/com/vexil/brindlewick/sampler", "com.vexil.brindlewick.Sampler",
+                         "SampleProcessesDone", "");
+    return 0;
+  }
+  sd_bus* bus_ = nullptr;
+  std::string storeFile_;
+  bool answers_;
+  std::atomic<bool> stop_{false};
+  std::atomic<int> requests_{0};
+  std::thread thread_;
+};
+
+TEST_F(BusService, AJobReportWaitsForTheSamplerWhenOneIsOnTheBus) {
+  auto service = serve(kDataEnd + 10000);
+  ASSERT_TRUE(service->running()) << service->err();
+  const MessageDictionary top{{"request_type", "top_launchd_jobs"}, {"count", std::uint64_t{1}}};
+  auto firstLabel = [&] {
+    return get<std::vector<std::string>>(get<MessageDictionary>(call(top).reply, "launchd_jobs"), "labels");
+  };
+  EXPECT_EQ(firstLabel(), std::vector<std::string>{"alpha"});  // no sampler: no wait, no fresh records
+  FakeSampler sampler(*bus, store / "sampled.stats", true);
+  EXPECT_EQ(firstLabel(), std::vector<std::string>{"fresh"});
+  EXPECT_EQ(sampler.requests(), 1);
+}
+
+TEST_F(BusService, TheSamplerPairWaitsOnlyForAnOwnerAndOnlyUntilItsTimeout) {
+  sd_bus* service = bus->connect();
+  sd_bus* waiting = bus->connect();
+  SamplerPair pair(service, waiting, std::chrono::milliseconds(200));
+  EXPECT_EQ(pair.sampleProcesses(), SamplerPair::Outcome::NoSampler);
+  {
+    FakeSampler silent(*bus, store / "silent.stats", false);
+    test::FakePlatform fake;
+    EXPECT_EQ(pair.sampleProcesses(), SamplerPair::Outcome::TimedOut);
+    EXPECT_EQ(pair.sampleProcesses(), SamplerPair::Outcome::TimedOut);
+    EXPECT_EQ(fake.systemLogLines.size(), 1u);  // logged once
+    EXPECT_EQ(silent.requests(), 2);
+  }
+  FakeSampler answering(*bus, store / "answered.stats", true);
+  EXPECT_EQ(pair.sampleProcesses(), SamplerPair::Outcome::Answered);
+  sd_bus_flush_close_unref(service);
+  sd_bus_flush_close_unref(waiting);
+}
+
+// The real binary: the name, introspection, the bus tools' view of a reply,
+// a second instance, and --xpc-debug.
+TEST_F(BusService, TheToolServesTheNameOnceAndIntrospects) {
+  const std::string version = *platform().currentSystemVersion();
+  const std::uint64_t start = static_cast<std::uint64_t>(platform().nowMicroseconds() / 1000) - 200000;
+  test::TempDir live;
+  test::writeBatteryStore(live / "battery.stats", *platform().currentBootUuid(), version, start);
+  const std::string dir = live.path();
+  ServiceProcess service(*bus, [dir] {
+    execl(BRINDLEWICK_BINARY, "brindlewick", "--debug", "--xpc", "--from", dir.c_str(), static_cast<char*>(nullptr));
+    return 127;
+  });
+  ASSERT_TRUE(service.running()) << service.err();
+
+  test::RunSettings env;
+  env.env["DBUS_SYSTEM_BUS_ADDRESS"] = bus->address();
+  const std::string address = "--address=" + bus->address();
+  test::ToolResult introspect =
+      test::runBinary("/usr/bin/busctl", {address, "introspect", kAnalysisName, kAnalysisPath, kAnalysisInterface});
+  EXPECT_NE(introspect.out.find(".Request"), std::string::npos) << introspect.out << introspect.err;
+  EXPECT_NE(introspect.out.find("a{sv}            a{sv}"), std::string::npos) << introspect.out;
+  EXPECT_NE(introspect.out.find(".SampleProcessesNow"), std::string::npos);
+
+  test::ToolResult called =
+      test::runBinary("/usr/bin/busctl", {address, "call", kAnalysisName, kAnalysisPath, kAnalysisInterface, "Request",
+                                          "a{sv}", "1", "request_type", "s", "battery_charge_graph"});
+  EXPECT_NE(called.out.find("\"charge_levels\" ad 5 80 78 78 76 74 \"charge_times\" at 5 "), std::string::npos)
+      << called.out << called.err;
+
+  ServiceProcess second(
+      *bus,
+      [dir] {
+        execl(BRINDLEWICK_BINARY, "brindlewick", "--debug", "--xpc", "--from", dir.c_str(),
+              static_cast<char*>(nullptr));
+        return 127;
+      },
+      false);
+  EXPECT_EQ(second.wait(), 1);
+
+  test::ToolResult debug = test::runTool({"--xpc-debug", "--from", dir});
+  EXPECT_EQ(debug.status, 0) << debug.err;
+  EXPECT_EQ(debug.out.rfind("a{sv} 7 \"battery_states\" ab 2 true false \"battery_times\" at 2 ", 0), 0u) << debug.out;
+  EXPECT_NE(debug.out.find("\"charge_levels\" ad 5 80 78 78 76 74 \"charge_times\" at 5 "), std::string::npos);
+}
+
+}  // namespace
+}  // namespace bw

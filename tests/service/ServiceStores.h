@@ -1,0 +1,84 @@
+#pragma once
+// Stores for the analysis service's tests, written with the record classes'
+// own encoder. Both hold one boot of one build with a single segment (wall
+// time = wallStart + absolute time − 1000), so position = absolute time − 1000.
+//
+// Battery store (last record at position 94000):
+//   position  1000  battery 4000/5000 mAh (80 %)
+//             2000  on battery (PowerStateChange 1)
+//            61000  3900 mAh (78 %)
+//            69000  sleep (reason 0), 70000 wake (reason 1)
+//            80000  3800 mAh, 90000 3700 mAh (the second after the wake
+//                   extends the curve back to 70000)
+//            94000  on A/C and fully charged
+// Job store (last record at position 49000): jobs from the table below,
+// each one process starting at absolute time 1500, sampled at 2000 with no
+// CPU time and at 50000 with its total (or at 40000 with its exit).
+#include <string>
+#include <vector>
+
+#include "cli/RecordModesStore.h"
+#include "summarizers/ProcessRecords.h"
+
+namespace bw::test {
+
+struct ServiceJob {
+  const char* name;
+  double cpuMs;
+  std::uint64_t idleWakeups = 0;
+  bool exits = false;
+  const char* displayName = nullptr;
+};
+
+// alpha 100 ms; beta 50 ms and 20 idle wake-ups (power score 60e6) with a
+// display name; gamma 30 ms, exited; j1..j9 with 1..9 ms.
+inline std::vector<ServiceJob> serviceJobs() {
+  std::vector<ServiceJob> jobs{{"alpha", 100}, {"beta", 50, 20, false, "Beta App"}, {"gamma", 30, 0, true}};
+  static const char* const names[] = {"j1", "j2", "j3", "j4", "j5", "j6", "j7", "j8", "j9"};
+  for (int i = 0; i < 9; ++i) jobs.push_back({names[i], static_cast<double>(i + 1)});
+  return jobs;
+}
+
+inline void writeBatteryStore(const std::string& path, const Uuid& bootUuid, const std::string& version,
+                              std::uint64_t wallStart) {
+  const std::uint64_t skew = wallStart - 1000;
+  auto batteryAt = [](std::uint64_t abs, std::int64_t charge) { return level(abs, charge, std::int64_t{12000}); };
+  auto power = [skew](std::uint64_t abs, std::uint64_t change, bool full) {
+    PowerStateChange c;
+    c.setAbsoluteTime(abs);
+    c.setWallTime(skew + abs);
+    c.setChange(change);
+    if (full) c.setIsFullyCharged(true);
+    return c;
+  };
+  StatsFileWriter w;
+  w.append(logStart(bootUuid, 1000, wallStart, version, nullptr));
+  w.append(batteryAt(2000, 4000));
+  w.append(power(3000, 1, false));
+  w.append(batteryAt(62000, 3900));
+  w.append(sleepWake(std::uint64_t{70000}, skew + 70000, 0u));
+  w.append(sleepWake(std::uint64_t{71000}, skew + 71000, 1u));
+  w.append(batteryAt(81000, 3800));
+  w.append(batteryAt(91000, 3700));
+  w.append(power(95000, 0, true));
+  w.writeTo(path);
+}
+
+inline void writeJobStore(const std::string& path, const Uuid& bootUuid, const std::string& version,
+                          std::uint64_t wallStart, const std::vector<ServiceJob>& jobs) {
+  StatsFileWriter w;
+  w.append(logStart(bootUuid, 1000, wallStart, version, nullptr));
+  std::uint64_t id = 100;
+  for (const ServiceJob& job : jobs) {
+    Sample s{.uniqueid = ++id, .at = 2000, .name = job.name, .start = 1500, .displayName = job.displayName};
+    w.append(processUsage(s));
+    s.at = job.exits ? 40000 : 50000;
+    s.status = job.exits ? 0 : -1;
+    s.cpuMs = job.cpuMs;
+    s.idle = job.idleWakeups;
+    w.append(processUsage(s));
+  }
+  w.writeTo(path);
+}
+
+}  // namespace bw::test
