@@ -62,7 +62,7 @@ class Server {
       // A caller that has left gets nothing; that is not an error here.
       if (r >= 0) sd_bus_send(nullptr, out, nullptr);
       sd_bus_message_unref(out);
-      return 1;
+      return r < 0 ? r : 1;  // sd-bus answers a failed reply with the error
     } catch (...) {
       // Unwinding through sd-bus is not allowed: the request is dropped
       // unanswered and the exception leaves the main loop instead.

@@ -80,9 +80,17 @@ int readValue(sd_bus_message* m, const std::string& signature, std::optional<Mes
     BW_TRY(readFixedArray(m, 'd', v));
     value.emplace(std::move(v));
   } else if (signature == "ab") {
-    std::vector<int> raw;
-    BW_TRY(readFixedArray(m, 'b', raw));
-    value.emplace(std::vector<bool>(raw.begin(), raw.end()));
+    std::vector<bool> v;
+    BW_TRY(sd_bus_message_enter_container(m, 'a', "b"));
+    for (;;) {
+      int b = 0;
+      int r = sd_bus_message_read_basic(m, 'b', &b);
+      BW_TRY(r);
+      if (r == 0) break;
+      v.push_back(b != 0);
+    }
+    BW_TRY(sd_bus_message_exit_container(m));
+    value.emplace(std::move(v));
   } else if (signature == "aas") {
     OptionalStrings v;
     BW_TRY(sd_bus_message_enter_container(m, 'a', "as"));
@@ -118,33 +126,40 @@ int appendStrings(sd_bus_message* m, const std::vector<std::string>& v) {
 }
 
 int appendValue(sd_bus_message* m, const MessageValue& value) {
-  return std::visit(
-      Overloaded{
-          [m](const std::string& v) { return sd_bus_message_append_basic(m, 's', v.c_str()); },
-          [m](std::uint64_t v) { return sd_bus_message_append_basic(m, 't', &v); },
-          [m](std::int64_t v) { return sd_bus_message_append_basic(m, 'x', &v); },
-          [m](bool v) {
-            int b = v;
-            return sd_bus_message_append_basic(m, 'b', &b);
-          },
-          [m](double v) { return sd_bus_message_append_basic(m, 'd', &v); },
-          [m](const std::vector<std::string>& v) { return appendStrings(m, v); },
-          [m](const std::vector<std::uint64_t>& v) { return appendFixedArray(m, 't', v); },
-          [m](const std::vector<std::int64_t>& v) { return appendFixedArray(m, 'x', v); },
-          [m](const std::vector<double>& v) { return appendFixedArray(m, 'd', v); },
-          [m](const std::vector<bool>& v) { return appendFixedArray(m, 'b', std::vector<int>(v.begin(), v.end())); },
-          [m](const OptionalStrings& v) {
-            BW_TRY(sd_bus_message_open_container(m, 'a', "as"));
-            for (const auto& name : v) {
-              std::vector<std::string> inner;
-              if (name) inner.push_back(*name);
-              BW_TRY(appendStrings(m, inner));
-            }
-            return sd_bus_message_close_container(m);
-          },
-          [m](const MessageDictionary& v) { return appendDictionary(m, v); },
-      },
-      value.storage());
+  return std::visit(Overloaded{
+                        [m](const std::string& v) { return sd_bus_message_append_basic(m, 's', v.c_str()); },
+                        [m](std::uint64_t v) { return sd_bus_message_append_basic(m, 't', &v); },
+                        [m](std::int64_t v) { return sd_bus_message_append_basic(m, 'x', &v); },
+                        [m](bool v) {
+                          int b = v;
+                          return sd_bus_message_append_basic(m, 'b', &b);
+                        },
+                        [m](double v) { return sd_bus_message_append_basic(m, 'd', &v); },
+                        [m](const std::vector<std::string>& v) { return appendStrings(m, v); },
+                        [m](const std::vector<std::uint64_t>& v) { return appendFixedArray(m, 't', v); },
+                        [m](const std::vector<std::int64_t>& v) { return appendFixedArray(m, 'x', v); },
+                        [m](const std::vector<double>& v) { return appendFixedArray(m, 'd', v); },
+                        [m](const std::vector<bool>& v) {
+                          // sd-bus takes no bool arrays in one piece
+                          BW_TRY(sd_bus_message_open_container(m, 'a', "b"));
+                          for (bool b : v) {
+                            int i = b;
+                            BW_TRY(sd_bus_message_append_basic(m, 'b', &i));
+                          }
+                          return sd_bus_message_close_container(m);
+                        },
+                        [m](const OptionalStrings& v) {
+                          BW_TRY(sd_bus_message_open_container(m, 'a', "as"));
+                          for (const auto& name : v) {
+                            std::vector<std::string> inner;
+                            if (name) inner.push_back(*name);
+                            BW_TRY(appendStrings(m, inner));
+                          }
+                          return sd_bus_message_close_container(m);
+                        },
+                        [m](const MessageDictionary& v) { return appendDictionary(m, v); },
+                    },
+                    value.storage());
 }
 
 }  // namespace

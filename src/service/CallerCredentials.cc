@@ -6,6 +6,7 @@
 #include <algorithm>
 #include <cstdint>
 #include <optional>
+#include <string_view>
 #include <vector>
 
 namespace bw {
@@ -36,34 +37,51 @@ std::vector<gid_t> groupsOfUser(uid_t uid) {
   return groups;
 }
 
-bool mayReadProcessUsage(uid_t uid, const std::vector<gid_t>& groups, const gid_t* admGroup) {
-  if (uid == 0) return true;
-  return admGroup && std::find(groups.begin(), groups.end(), *admGroup) != groups.end();
+// The sender's groups as the bus daemon saw them when it connected
+// ("UnixGroupIDs" of GetConnectionCredentials); none when it does not say.
+std::optional<std::vector<gid_t>> groupsFromBus(sd_bus_message* message) {
+  sd_bus_message* reply = nullptr;
+  sd_bus_error error = SD_BUS_ERROR_NULL;
+  std::optional<std::vector<gid_t>> groups;
+  int r = sd_bus_call_method(sd_bus_message_get_bus(message), "org.freedesktop.DBus", "/org/freedesktop/DBus",
+                             "org.freedesktop.DBus", "GetConnectionCredentials", &error, &reply, "s",
+                             sd_bus_message_get_sender(message));
+  if (r >= 0) r = sd_bus_message_enter_container(reply, 'a', "{sv}");
+  while (r >= 0 && sd_bus_message_enter_container(reply, 'e', "sv") > 0) {
+    const char* key = nullptr;
+    if (sd_bus_message_read_basic(reply, 's', &key) < 0) break;
+    if (std::string_view(key) == "UnixGroupIDs" && sd_bus_message_enter_container(reply, 'v', "au") > 0) {
+      const void* data = nullptr;
+      std::size_t size = 0;
+      if (sd_bus_message_read_array(reply, 'u', &data, &size) >= 0) {
+        const auto* ids = static_cast<const std::uint32_t*>(data);
+        groups.emplace(ids, ids + size / sizeof(std::uint32_t));
+      }
+      sd_bus_message_exit_container(reply);
+    } else if (sd_bus_message_skip(reply, "v") < 0) {
+      break;
+    }
+    sd_bus_message_exit_container(reply);
+  }
+  sd_bus_message_unref(reply);
+  sd_bus_error_free(&error);
+  return groups;
 }
 
 }  // namespace
 
 bool senderMayReadProcessUsage(sd_bus_message* message) {
   sd_bus_creds* creds = nullptr;
-  const std::uint64_t mask =
-      SD_BUS_CREDS_UID | SD_BUS_CREDS_EUID | SD_BUS_CREDS_GID | SD_BUS_CREDS_EGID | SD_BUS_CREDS_SUPPLEMENTARY_GIDS;
-  if (sd_bus_query_sender_creds(message, mask, &creds) < 0) return false;
+  if (sd_bus_query_sender_creds(message, SD_BUS_CREDS_EUID | SD_BUS_CREDS_UID, &creds) < 0) return false;
   uid_t uid = 0;
-  bool known = sd_bus_creds_get_euid(creds, &uid) >= 0 || sd_bus_creds_get_uid(creds, &uid) >= 0;
-  std::vector<gid_t> groups;
-  const gid_t* supplementary = nullptr;
-  int n = known ? sd_bus_creds_get_supplementary_gids(creds, &supplementary) : -1;
-  if (n >= 0) {
-    groups.assign(supplementary, supplementary + n);
-    gid_t gid = 0;
-    if (sd_bus_creds_get_egid(creds, &gid) >= 0 || sd_bus_creds_get_gid(creds, &gid) >= 0) groups.push_back(gid);
-  } else if (known) {
-    groups = groupsOfUser(uid);
-  }
+  const bool known = sd_bus_creds_get_euid(creds, &uid) >= 0 || sd_bus_creds_get_uid(creds, &uid) >= 0;
   sd_bus_creds_unref(creds);
   if (!known) return false;
+  if (uid == 0) return true;
+  std::optional<std::vector<gid_t>> groups = groupsFromBus(message);
+  if (!groups) groups = groupsOfUser(uid);
   const std::optional<gid_t> adm = admGroupId();
-  return mayReadProcessUsage(uid, groups, adm ? &*adm : nullptr);
+  return adm && std::find(groups->begin(), groups->end(), *adm) != groups->end();
 }
 
 }  // namespace bw

@@ -5,11 +5,10 @@
 
 namespace bw {
 
-// Whether the sender of `message` may have the job report, with its
-// credentials from the bus
-// (sd_bus_query_sender_creds); where the bus does not know the caller's
-// groups, the group database's list for its user. False when the bus
-// cannot say who sent it (a caller that has left).
+// Whether the sender of `message` may have the job report: its user from
+// the bus (sd_bus_query_sender_creds), its groups as the bus daemon saw them
+// or, where the daemon does not say, the group database's list for the
+// user. False when the bus cannot say who sent it (a caller that has left).
 bool senderMayReadProcessUsage(sd_bus_message* message);
 
 }  // namespace bw

@@ -176,7 +176,7 @@ TEST_F(BusService, OnlyRootAndTheAdmGroupGetTheJobReport) {
   const group* adm = getgrnam("adm");
   if (!adm) GTEST_SKIP() << "no group adm";
   const std::string allowed = get<std::string>(callAsNobody(*bus, jobs, {adm->gr_gid}).reply, "text");
-  EXPECT_NE(allowed.find("\"labels\" as 10 \"alpha\""), std::string::npos) << allowed;
+  EXPECT_NE(allowed.find("\"labels\" as 10 \"alpha\""), std::string::npos) << allowed << service->err();
 }
 
 // A stand-in for the recorder: owns the sampler's name and, on
@@ -207,7 +207,7 @@ class FakeSampler {
   static int onNow(sd_bus_message*, void* self, sd_bus_error*) {
     auto* s = static_cast<FakeSampler*>(self);
     ++s->requests_;
-    test::writeJobStore(s->storeFile_, kBoot, "6.1.0-test", kWallStart, {{"fresh", 1000}});
+    test::writeJobStore(s->storeFile_, kBoot, "6.1.0-test", kWallStart, {{"fresh", 1000}}, 500);
     if (s->answers_)
       sd_bus_emit_signal(s->bus_, "/com/vexil/brindlewick/sampler", "com.vexil.brindlewick.Sampler",
                          "SampleProcessesDone", "");
@@ -273,7 +273,7 @@ TEST_F(BusService, TheToolServesTheNameOnceAndIntrospects) {
   test::ToolResult introspect =
       test::runBinary("/usr/bin/busctl", {address, "introspect", kAnalysisName, kAnalysisPath, kAnalysisInterface});
   EXPECT_NE(introspect.out.find(".Request"), std::string::npos) << introspect.out << introspect.err;
-  EXPECT_NE(introspect.out.find("a{sv}            a{sv}"), std::string::npos) << introspect.out;
+  EXPECT_NE(introspect.out.find("method    a{sv}     a{sv}"), std::string::npos) << introspect.out;
   EXPECT_NE(introspect.out.find(".SampleProcessesNow"), std::string::npos);
 
   test::ToolResult called =

@@ -64,11 +64,12 @@ inline void writeBatteryStore(const std::string& path, const Uuid& bootUuid, con
   w.writeTo(path);
 }
 
+// Process unique ids count up from `firstId` + 1.
 inline void writeJobStore(const std::string& path, const Uuid& bootUuid, const std::string& version,
-                          std::uint64_t wallStart, const std::vector<ServiceJob>& jobs) {
+                          std::uint64_t wallStart, const std::vector<ServiceJob>& jobs, std::uint64_t firstId = 100) {
   StatsFileWriter w;
   w.append(logStart(bootUuid, 1000, wallStart, version, nullptr));
-  std::uint64_t id = 100;
+  std::uint64_t id = firstId;
   for (const ServiceJob& job : jobs) {
     Sample s{.uniqueid = ++id, .at = 2000, .name = job.name, .start = 1500, .displayName = job.displayName};
     w.append(processUsage(s));
