@@ -43,6 +43,11 @@ SamplerPair::SamplerPair(sd_bus* serviceBus, sd_bus* waitBus, std::chrono::milli
     : serviceBus_(serviceBus), waitBus_(waitBus), timeout_(timeout) {}
 
 SamplerPair::Outcome SamplerPair::sampleProcesses() {
+  // Drops what came in since the last request (a late answer, say), so that
+  // only an answer to this request counts.
+  if (waitBus_)
+    while (sd_bus_process(waitBus_, nullptr) > 0) {
+    }
   const std::string owner = waitBus_ ? samplerOwner(waitBus_) : std::string();
   bool done = false;
   bool left = false;

@@ -298,5 +298,18 @@ TEST_F(BusService, TheToolServesTheNameOnceAndIntrospects) {
   EXPECT_NE(debug.out.find("\"charge_levels\" ad 5 80 78 78 76 74 \"charge_times\" at 5 "), std::string::npos);
 }
 
+TEST_F(BusService, DbusStarterBusTypeSessionPicksTheSessionBus) {
+  const std::string dir = store.path();
+  const std::string address = bus->address();
+  ServiceProcess service(*bus, [dir, address] {
+    setenv("DBUS_SYSTEM_BUS_ADDRESS", "unix:path=/nonexistent/bus", 1);
+    setenv("DBUS_SESSION_BUS_ADDRESS", address.c_str(), 1);
+    setenv("DBUS_STARTER_BUS_TYPE", "session", 1);
+    execl(BRINDLEWICK_BINARY, "brindlewick", "--debug", "--xpc", "--from", dir.c_str(), static_cast<char*>(nullptr));
+    return 127;
+  });
+  EXPECT_TRUE(service.running()) << service.err();
+}
+
 }  // namespace
 }  // namespace bw
