@@ -9,6 +9,7 @@
 #include <vector>
 
 #include "LargeStore.h"
+#include "cli/ModelLoader.h"
 #include "cli/Options.h"
 #include "model/Model.h"
 #include "summarizers/CPUSummarizer.h"
@@ -28,7 +29,7 @@ Store& store() {
   static Store s = [] {
     Store made;
     made.options.setFrom_path(bw::bench::largeStore());
-    made.models = bw::Model::modelsWithOptions(made.options, false);
+    made.models = bw::loadModels(made.options);
     for (const auto& model : made.models) {
       model->timeline().enumerateEventsUsingBlock(
           [&](const bw::Record&, std::uint64_t, std::uint64_t, const bw::AbsTime&, bool&) { ++made.records; });

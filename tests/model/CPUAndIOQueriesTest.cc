@@ -4,6 +4,7 @@
 
 #include "Records/PackageEnergyStatistics.h"
 #include "Records/SystemIO.h"
+#include "cli/ModelLoader.h"
 #include "cli/Options.h"
 #include "cli/RecordModesStore.h"
 #include "model/Model.h"
@@ -67,9 +68,9 @@ class CPUAndIOQueries : public ::testing::Test {
     b.writeTo(dir.write("var/db/brindlewick/B.stats"));
 
     options.setFrom_path(dir.path());
-    models = Model::modelsWithOptions(options, false);
+    models = loadModels(options);
     ASSERT_EQ(models.size(), 1u);
-    models[0]->processEventsWithDomains({}, options);
+    models[0]->processEventsWithDomains({}, true);
   }
   test::TempDir dir;
   Options options;
