@@ -15,6 +15,7 @@
 #include <vector>
 
 #include "LargeStore.h"
+#include "cli/ModelLoader.h"
 #include "cli/Options.h"
 #include "model/Model.h"
 #include "summarizers/ProcessSummarizer.h"
@@ -25,7 +26,7 @@ std::vector<std::unique_ptr<bw::Model>>& models() {
   static std::vector<std::unique_ptr<bw::Model>> loaded = [] {
     bw::Options options;
     options.setFrom_path(bw::bench::largeStore());
-    return bw::Model::modelsWithOptions(options, false);
+    return bw::loadModels(options);
   }();
   return loaded;
 }

@@ -1,7 +1,6 @@
 #include <gtest/gtest.h>
 
 #include "Records/LogStartsV1.h"
-#include "cli/Options.h"
 #include "model/Model.h"
 #include "summarizers/ProcessRecords.h"
 #include "summarizers/ProcessSummarizer.h"
@@ -32,9 +31,7 @@ class ModelProcesses : public ::testing::Test {
     std::vector<std::unique_ptr<Timeline>> boots;
     boots.push_back(std::make_unique<BootTimeline>(test::boot(1), records));
     model = std::make_unique<Model>(Timeline::timelineWithTimelines(std::move(boots)), "23A344");
-    Options options;
-    options.setMode(kModeDashboard);
-    model->processEventsWithDomains({}, options);
+    model->processEventsWithDomains({}, true);
   }
   double cpuMs(const ProcessSummary& root, const char* job) { return root.subprocesses().at(job)->cpuTime() / 1e6; }
 

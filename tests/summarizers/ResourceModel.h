@@ -6,7 +6,6 @@
 #include <vector>
 
 #include "Records/LogStartsV1.h"
-#include "cli/Options.h"
 #include "model/Model.h"
 #include "time/BootTimeline.h"
 
@@ -29,7 +28,7 @@ class ResourceModel {
     boots.push_back(
         std::make_unique<BootTimeline>(Uuid(Uuid::Bytes{7, 7, 7, 7, 7, 7, 7, 7, 7, 7, 7, 7, 7, 7, 7, 7}), pointers));
     model_ = std::make_unique<Model>(Timeline::timelineWithTimelines(std::move(boots)), "22A100");
-    model_->processEventsWithDomains({}, Options{});
+    model_->processEventsWithDomains({}, true);
   }
   Model& model() { return *model_; }
 
