@@ -4,6 +4,7 @@
 
 #include "Records/PackageEnergyStatistics.h"
 #include "Records/SystemIO.h"
+#include "cli/ModelLoader.h"
 #include "cli/Options.h"
 #include "cli/RecordModesStore.h"
 #include "cli/ModelLoader.h"
