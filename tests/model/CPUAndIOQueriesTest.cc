@@ -7,7 +7,6 @@
 #include "cli/ModelLoader.h"
 #include "cli/Options.h"
 #include "cli/RecordModesStore.h"
-#include "cli/ModelLoader.h"
 #include "model/Model.h"
 #include "summarizers/CPUSummary.h"
 #include "summarizers/IOSummary.h"
