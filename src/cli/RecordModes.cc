@@ -90,13 +90,13 @@ void plotModel(const Model& model) {
       [&](const Record& event, std::uint64_t position, std::uint64_t, const AbsTime&, bool&) {
         if (event.recordClass() != RecordClass::SleepWake) return;
         switch (static_cast<const SleepWake&>(event).reason()) {
-          case 0:
+          case SleepWake::kSleep:
             plotLine(o, position, 100);
             break;
-          case 2:
+          case SleepWake::kDarkWake:
             plotLine(o, position, 50);
             break;
-          case 1:
+          case SleepWake::kWake:
             plotLine(o, position, 0);
             break;
           default:
@@ -109,11 +109,11 @@ void plotModel(const Model& model) {
       });
 
   o << '\n';
-  timeline.enumerateEventsUsingBlock(
-      [&](const Record& event, std::uint64_t position, std::uint64_t, const AbsTime&, bool&) {
-        if (event.recordClass() != RecordClass::PowerStateChange) return;
-        plotLine(o, position, static_cast<const PowerStateChange&>(event).change() != 0 ? 0 : 100);
-      });
+  timeline.enumerateEventsUsingBlock([&](const Record& event, std::uint64_t position, std::uint64_t, const AbsTime&,
+                                         bool&) {
+    if (event.recordClass() != RecordClass::PowerStateChange) return;
+    plotLine(o, position, static_cast<const PowerStateChange&>(event).change() != PowerStateChange::kOnAC ? 0 : 100);
+  });
 }
 
 }  // namespace

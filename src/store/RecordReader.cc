@@ -211,7 +211,7 @@ class BootGrouper {
     std::vector<Record*>& bootRecords = out_.boots[boot];
     bootRecords.insert(bootRecords.end(), file.records.begin(), file.records.end());
     if (file.damaged) damaged_.push_back(boot);
-    if (asHeader(first).writer() == 5) {
+    if (asHeader(first).writer() == LogStartsV1::kSingleFileWriter) {
       if (!writerFiveSeen_.insert(boot).second) {
         throw Exception(kInternalInconsistencyException, "duplicate boot uuid detected");
       }
