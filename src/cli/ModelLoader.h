@@ -22,10 +22,12 @@ bool feedsSummarizers(const Options& options);
 
 // The stats files of the run. A `--from` directory without any ends the run
 // with "--from path contained no Brindlewick trace files." (status 66).
-FileList runFileList(const StoreQuery& query);
+// `observer` hears of folders that could not be listed.
+FileList runFileList(const StoreQuery& query, ReadObserver* observer = nullptr);
 
 // Reads the store the options select and builds one model per system
-// version, each holding its boots in sequence; nothing is fed yet.
+// version, each holding its boots in sequence; nothing is fed yet. A person
+// at a terminal sees the reading's progress and damage (cli/StoreWatch.h).
 std::vector<std::unique_ptr<Model>> loadModels(const Options& options);
 
 }  // namespace bw

@@ -9,6 +9,7 @@
 #include "Records/PowerStateChange.h"
 #include "Records/SleepWake.h"
 #include "base/Console.h"
+#include "cli/EmptyResult.h"
 #include "cli/ModelLoader.h"
 #include "cli/ModelRunner.h"
 #include "cli/Options.h"
@@ -21,13 +22,18 @@ namespace bw {
 
 void runRecordDump(const Options& options) {
   std::ostream& o = out();
-  for (const std::unique_ptr<Model>& model : loadModels(options)) {
+  const std::vector<std::unique_ptr<Model>> models = loadModels(options);
+  EmptyStage reached = EmptyStage::kNoRecords;
+  bool printed = false;
+  for (const std::unique_ptr<Model>& model : models) {
     std::unique_ptr<Domain> domain = Domain::domainWithSpec(domainSpec(options));
     model->processEventsWithDomains({domain.get()}, feedsSummarizers(options));
+    reached = EmptyStage::kNoRange;
     if (domain->ranges().empty()) continue;
     std::optional<Uuid> shownBoot;  // starts afresh for every model
     model->timeline().enumerateEventsInRelativeRanges(
         domain->ranges(), [&](const Record& event, std::uint64_t, std::uint64_t, const AbsTime& absTime, bool&) {
+          printed = true;
           if (shownBoot != absTime.boot) {
             shownBoot = absTime.boot;
             o << "===== Boot " << absTime.boot.string() << " =====\n";
@@ -35,6 +41,7 @@ void runRecordDump(const Options& options) {
           o << event.className() << ' ' << describeValue(Value(event.dictionaryRepresentation())) << '\n';
         });
   }
+  if (!printed) noteEmptyResult(options, models, reached);
 }
 
 void runEventListing(const Options& options) {
