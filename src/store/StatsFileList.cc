@@ -63,8 +63,9 @@ void listTreeInto(std::vector<std::string>& names, const std::string& directory,
     const std::string name = entry->d_name;
     if (name == "." || name == "..") continue;
     const std::string path = joinPath(directory, name);
-    names.push_back(relative.empty() ? name : relative + "/" + name);
-    if (isDirectoryEntry(path, *entry)) listTreeInto(names, path, names.back(), observer);
+    std::string entryRelative = relative.empty() ? name : relative + "/" + name;
+    names.push_back(entryRelative);
+    if (isDirectoryEntry(path, *entry)) listTreeInto(names, path, entryRelative, observer);
   }
   closedir(dir);
 }
