@@ -39,13 +39,14 @@ FileList runFileList(const StoreQuery& query, ReadObserver* observer) {
   return files;
 }
 
-std::vector<std::unique_ptr<Model>> loadModels(const Options& options) {
+std::vector<std::unique_ptr<Model>> loadModels(const Options& options, StoreWatch* outerWatch) {
   const StoreQuery query = storeQuery(options);
-  StoreWatch watch;
+  StoreWatch ownWatch;
+  StoreWatch& watch = outerWatch ? *outerWatch : ownWatch;
   const FileList files = runFileList(query, &watch);
   watch.begin(files.size());
   RecordsByBoot read = readStatsFiles(std::vector<std::string>(files.begin(), files.end()), query, &watch);
-  watch.end();
+  watch.step("sequencing boots");
   auto pool = std::make_shared<RecordPool>(std::move(read.pool));
   std::vector<std::unique_ptr<Model>> models;
   for (auto& [version, timeline] : sequenceBoots(read.boots)) {

@@ -2,10 +2,12 @@
 
 #include <algorithm>
 
+#include "base/Console.h"
 #include "base/Exception.h"
 #include "cli/EmptyResult.h"
 #include "cli/ModelLoader.h"
 #include "cli/Options.h"
+#include "cli/StoreWatch.h"
 #include "domains/Domain.h"
 #include "domains/PostInstallDomain.h"
 #include "domains/RangeList.h"
@@ -27,10 +29,13 @@ void checkMaskStates(const Options& options) {
 void runPerModel(const Options& options, const ModelAction& action) {
   checkMaskStates(options);
   const std::vector<std::string> maskStates = options.domain_mask_states().value_or(std::vector<std::string>{});
-  const std::vector<std::unique_ptr<Model>> models = loadModels(options);
+  StoreWatch watch;
+  const std::vector<std::unique_ptr<Model>> models = loadModels(options, &watch);
   bool acted = false;
   EmptyStage reached = EmptyStage::kNoRecords;
+  std::size_t fed = 0;
   for (const std::unique_ptr<Model>& model : models) {
+    if (!acted) watch.step(format("feeding model %zu of %zu", ++fed, models.size()));
     std::unique_ptr<Domain> domain = Domain::domainWithSpec(domainSpec(options));
     std::unique_ptr<PostInstallDomain> postInstall;
     std::vector<Summarizer*> domains{domain.get()};
@@ -48,10 +53,12 @@ void runPerModel(const Options& options, const ModelAction& action) {
     reached = std::max(reached, EmptyStage::kOnlyPostInstall);
     if (postInstall && !postInstall->ranges().empty()) *ranges = subtractRanges(*ranges, postInstall->ranges());
     if (!ranges->empty()) {
+      watch.end();
       action(*model, *ranges);
       acted = true;
     }
   }
+  watch.end();
   if (!acted) noteEmptyResult(options, models, reached);
 }
 

@@ -13,6 +13,7 @@
 #include "cli/ModelLoader.h"
 #include "cli/ModelRunner.h"
 #include "cli/Options.h"
+#include "cli/StoreWatch.h"
 #include "domains/Domain.h"
 #include "domains/WallTimeText.h"
 #include "model/Model.h"
@@ -22,10 +23,13 @@ namespace bw {
 
 void runRecordDump(const Options& options) {
   std::ostream& o = out();
-  const std::vector<std::unique_ptr<Model>> models = loadModels(options);
+  StoreWatch watch;
+  const std::vector<std::unique_ptr<Model>> models = loadModels(options, &watch);
   EmptyStage reached = EmptyStage::kNoRecords;
   bool printed = false;
+  std::size_t fed = 0;
   for (const std::unique_ptr<Model>& model : models) {
+    if (!printed) watch.step(format("feeding model %zu of %zu", ++fed, models.size()));
     std::unique_ptr<Domain> domain = Domain::domainWithSpec(domainSpec(options));
     model->processEventsWithDomains({domain.get()}, feedsSummarizers(options));
     reached = EmptyStage::kNoRange;
@@ -33,6 +37,7 @@ void runRecordDump(const Options& options) {
     std::optional<Uuid> shownBoot;  // starts afresh for every model
     model->timeline().enumerateEventsInRelativeRanges(
         domain->ranges(), [&](const Record& event, std::uint64_t, std::uint64_t, const AbsTime& absTime, bool&) {
+          if (!printed) watch.end();
           printed = true;
           if (shownBoot != absTime.boot) {
             shownBoot = absTime.boot;
@@ -41,6 +46,7 @@ void runRecordDump(const Options& options) {
           o << event.className() << ' ' << describeValue(Value(event.dictionaryRepresentation())) << '\n';
         });
   }
+  watch.end();
   if (!printed) noteEmptyResult(options, models, reached);
 }
 

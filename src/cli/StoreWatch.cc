@@ -33,6 +33,12 @@ void StoreWatch::begin(std::size_t files) {
   gDamage.filesListed += files;
 }
 
+void StoreWatch::step(const std::string& what) {
+  step_ = ", " + what;
+  const std::uint64_t now = platform().absoluteMilliseconds();
+  if (now - startMs_ >= kQuietMs) draw(now);
+}
+
 void StoreWatch::end() {
   if (drawn_) clearTransientLine();
   drawn_ = false;
@@ -61,7 +67,8 @@ void StoreWatch::fileRead(const std::string& path, const FileRecords& file) {
 void StoreWatch::draw(std::uint64_t now) {
   if (!errIsTerminal()) return;
   showTransientLine(format("reading the store: %zu/%zu files, %zu records, %llu s", filesDone_, files_, records_,
-                           static_cast<unsigned long long>((now - startMs_) / 1000)));
+                           static_cast<unsigned long long>((now - startMs_) / 1000)) +
+                    step_);
   drawn_ = true;
   lastDrawMs_ = now;
 }

@@ -3,7 +3,8 @@
 // error only, and only when it is a terminal):
 // - once reading has taken about a second, a self-erasing progress line,
 //   "reading the store: 12/40 files, 1234567 records, 3 s", redrawn as files
-//   finish and erased when reading ends;
+//   finish, then naming the later steps (", sequencing boots", ", feeding
+//   model 1 of 2") until the first line of output or the end;
 // - a note for each folder that could not be listed and each file that
 //   could not be opened, with the system's reason;
 // - the run's damage (files not read, boots dropped), kept for the one
@@ -29,7 +30,9 @@ class StoreWatch : public ReadObserver {
 
   // How many files the reading will go through.
   void begin(std::size_t files);
-  // Erases the progress line.
+  // Names the step after reading on the progress line (once it shows).
+  void step(const std::string& what);
+  // Erases the progress line; call before anything goes to standard output.
   void end();
 
   void directoryUnlisted(const std::string& path, int error) override;
@@ -44,6 +47,7 @@ class StoreWatch : public ReadObserver {
   std::size_t files_ = 0;
   std::size_t filesDone_ = 0;
   std::size_t records_ = 0;
+  std::string step_;
 };
 
 // What the run's readings of the store lost so far.

@@ -54,6 +54,9 @@ TEST_F(StoreWatchTest, ProgressShowsAfterASecondAndErasesItself) {
             "\rreading the store: 2/4 files, 5 records, 1 s\033[K"
             "\rreading the store: 4/4 files, 6 records, 2 s\033[K");
   err.str("");
+  watch.step("feeding model 1 of 2");  // later steps keep the line up
+  EXPECT_EQ(err.str(), "\rreading the store: 4/4 files, 6 records, 2 s, feeding model 1 of 2\033[K");
+  err.str("");
   terminalNote("a note");  // a note first erases the line
   EXPECT_EQ(err.str(), "\r\033[Kbrindlewick: a note\n");
   err.str("");
