@@ -2,6 +2,7 @@
 
 #include "base/Console.h"
 #include "cli/Options.h"
+#include "cli/StoreWatch.h"
 #include "model/Model.h"
 #include "store/RecordReader.h"
 #include "time/BootSequencer.h"
@@ -32,16 +33,20 @@ bool feedsSummarizers(const Options& options) {
   return options.mode() != kModeDump && options.mode() != kModeShowEvents;
 }
 
-FileList runFileList(const StoreQuery& query) {
-  FileList files = statsFileList(query);
+FileList runFileList(const StoreQuery& query, ReadObserver* observer) {
+  FileList files = statsFileList(query, observer);
   if (query.fromPath && files.empty()) exitWithMessage(66, "--from path contained no Brindlewick trace files.");
   return files;
 }
 
-std::vector<std::unique_ptr<Model>> loadModels(const Options& options) {
+std::vector<std::unique_ptr<Model>> loadModels(const Options& options, StoreWatch* outerWatch) {
   const StoreQuery query = storeQuery(options);
-  const FileList files = runFileList(query);
-  RecordsByBoot read = readStatsFiles(std::vector<std::string>(files.begin(), files.end()), query);
+  StoreWatch ownWatch;
+  StoreWatch& watch = outerWatch ? *outerWatch : ownWatch;
+  const FileList files = runFileList(query, &watch);
+  watch.begin(files.size());
+  RecordsByBoot read = readStatsFiles(std::vector<std::string>(files.begin(), files.end()), query, &watch);
+  watch.step("sequencing boots");
   auto pool = std::make_shared<RecordPool>(std::move(read.pool));
   std::vector<std::unique_ptr<Model>> models;
   for (auto& [version, timeline] : sequenceBoots(read.boots)) {

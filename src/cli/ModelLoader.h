@@ -13,6 +13,7 @@ namespace bw {
 
 class Model;
 class Options;
+class StoreWatch;
 
 StoreQuery storeQuery(const Options& options);
 DomainSpec domainSpec(const Options& options);
@@ -22,10 +23,14 @@ bool feedsSummarizers(const Options& options);
 
 // The stats files of the run. A `--from` directory without any ends the run
 // with "--from path contained no Brindlewick trace files." (status 66).
-FileList runFileList(const StoreQuery& query);
+// `observer` hears of folders that could not be listed.
+FileList runFileList(const StoreQuery& query, ReadObserver* observer = nullptr);
 
 // Reads the store the options select and builds one model per system
-// version, each holding its boots in sequence; nothing is fed yet.
-std::vector<std::unique_ptr<Model>> loadModels(const Options& options);
+// version, each holding its boots in sequence; nothing is fed yet. A person
+// at a terminal sees the reading's progress and damage (cli/StoreWatch.h);
+// a caller that passes its own `watch` keeps the progress line up through
+// its later steps and ends it itself.
+std::vector<std::unique_ptr<Model>> loadModels(const Options& options, StoreWatch* watch = nullptr);
 
 }  // namespace bw

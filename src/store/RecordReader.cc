@@ -112,7 +112,11 @@ Uuid bootOf(const Record* header) { return asHeader(header).bootUUID().value_or(
 
 FileRecords readStatsFile(const std::string& path, const StoreQuery& query, RecordPool& pool) {
   MappedFile file(path);
-  if (!file.ok()) return FileRecords();
+  if (!file.ok()) {
+    FileRecords unread;
+    unread.openError = file.error();
+    return unread;
+  }
   return readStatsData(file.data(), file.size(), path, query, pool);
 }
 
@@ -192,6 +196,7 @@ FileRecords readStatsData(const std::uint8_t* data, std::size_t size, const std:
       // Nothing was collected yet: the file is dropped without marking a boot.
       pool.rewind(fileStart);
       result.records.clear();
+      result.undecodable = true;
     }
   }
   return result;
@@ -235,9 +240,13 @@ class BootGrouper {
 
 }  // namespace
 
-RecordsByBoot readStatsFiles(const std::vector<std::string>& paths, const StoreQuery& query) {
+RecordsByBoot readStatsFiles(const std::vector<std::string>& paths, const StoreQuery& query, ReadObserver* observer) {
   BootGrouper grouper;
-  for (const std::string& path : paths) grouper.add(readStatsFile(path, query, grouper.pool()));
+  for (const std::string& path : paths) {
+    FileRecords file = readStatsFile(path, query, grouper.pool());
+    if (observer) observer->fileRead(path, file);
+    grouper.add(std::move(file));
+  }
   return grouper.finish();
 }
 
