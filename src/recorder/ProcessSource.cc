@@ -31,28 +31,38 @@ std::optional<StatLine> parseStat(const std::string& text) {
   return s;
 }
 
-std::string unitOf(const std::string& cgroups) {
-  std::string path;
+struct Cgroup {
+  std::string path;          // the unified hierarchy's path, or the named systemd one
+  std::string unit;          // its last ".service" or ".scope" component
+  bool userManager = false;  // inside a user@ service
+};
+
+Cgroup cgroupOf(const std::string& cgroups) {
+  Cgroup g;
   for (const auto& line : splitLines(cgroups)) {
-    if (line.rfind("0::", 0) == 0)
-      path = line.substr(3);
-    else if (path.empty() && line.find(":name=systemd:") != std::string::npos)
-      path = line.substr(line.find(":/") + 1);
+    if (line.rfind("0::", 0) == 0) {
+      g.path = line.substr(3);
+    } else if (g.path.empty() && line.find(":name=systemd:") != std::string::npos) {
+      g.path = line.substr(line.find(":/") + 1);
+    }
   }
-  std::string unit;
+  std::string userService;
   std::size_t from = 0;
-  while (from < path.size()) {
-    std::size_t end = path.find('/', from);
-    if (end == std::string::npos) end = path.size();
-    const std::string part = path.substr(from, end - from);
-    const auto endsWith = [&](const char* suffix) {
-      const std::string s = suffix;
-      return part.size() > s.size() && part.compare(part.size() - s.size(), s.size(), s) == 0;
+  while (from < g.path.size()) {
+    std::size_t end = g.path.find('/', from);
+    if (end == std::string::npos) end = g.path.size();
+    const std::string part = g.path.substr(from, end - from);
+    const auto endsWith = [&](const std::string& suffix) {
+      return part.size() > suffix.size() && part.compare(part.size() - suffix.size(), suffix.size(), suffix) == 0;
     };
-    if (endsWith(".service") || endsWith(".scope")) unit = part;
+    if (endsWith(".service") || endsWith(".scope")) g.unit = part;
+    if (part.rfind("user@", 0) == 0 && endsWith(".service")) userService = part;
     from = end + 1;
   }
-  return unit;
+  g.userManager = !userService.empty();
+  // The user manager itself sits in its service's init.scope: name the service.
+  if (g.unit == "init.scope" && !userService.empty()) g.unit = userService;
+  return g;
 }
 
 std::uint64_t statusValue(const std::string& status, const char* key, bool kilobytes) {
@@ -86,6 +96,7 @@ std::unordered_map<std::uint64_t, ProcessInfo> ProcessSource::scan(std::uint64_t
   std::unordered_map<std::uint64_t, ProcessInfo> byId;
   std::unordered_map<std::uint64_t, std::uint64_t> idOfPid;
   std::unordered_map<std::uint64_t, std::uint64_t> startOf;  // unique id -> start ticks
+  std::unordered_map<std::uint64_t, std::string> groupOf;    // unique id -> cgroup path
   for (const std::uint64_t pid : pids()) {
     const std::string dir = "/proc/" + std::to_string(pid) + "/";
     const auto statText = machine_.text(dir + "stat");
@@ -105,7 +116,8 @@ std::unordered_map<std::uint64_t, ProcessInfo> ProcessSource::scan(std::uint64_t
     p.uid = statusValue(status, "Uid", false);  // the real user id comes first
     p.residentBytes = statusValue(status, "VmRSS", true);
     p.footprintBytes = statusValue(status, "RssAnon", true) + statusValue(status, "VmSwap", true);
-    p.unit = unitOf(machine_.text(dir + "cgroup").value_or(""));
+    const Cgroup cgroup = cgroupOf(machine_.text(dir + "cgroup").value_or(""));
+    p.unit = cgroup.unit;
 
     std::string name = stat->comm;
     if (auto exe = machine_.link(dir + "exe")) {
@@ -116,30 +128,29 @@ std::unordered_map<std::uint64_t, ProcessInfo> ProcessSource::scan(std::uint64_t
     }
     if (pid == 1) {
       name = kInitName;
-    } else if (name == "systemd" && p.unit.rfind("user@", 0) == 0) {
+    } else if (name == "systemd" && cgroup.userManager) {
       name = kUserManagerName;
     }
     p.name = name;
     idOfPid[pid] = p.uniqueid;
     startOf[p.uniqueid] = stat->start;
+    groupOf[p.uniqueid] = cgroup.path;
     byId.emplace(p.uniqueid, std::move(p));
   }
 
-  // Parents, and the oldest process of each unit as the responsible one.
-  std::map<std::string, std::pair<std::uint64_t, std::uint64_t>> oldest;  // unit -> (start, unique id)
+  // Parents, and the oldest process of each unit's cgroup as the responsible one.
+  std::map<std::string, std::pair<std::pair<std::uint64_t, std::uint64_t>, std::uint64_t>> oldest;
   for (const auto& [id, p] : byId) {
     if (p.unit.empty()) continue;
-    const auto key = std::make_pair(startOf[id], p.pid);
-    auto it = oldest.find(p.unit);
-    if (it == oldest.end() || key < std::make_pair(startOf[it->second.second], byId.at(it->second.second).pid)) {
-      oldest[p.unit] = {startOf[id], id};
-    }
+    const auto age = std::make_pair(startOf[id], p.pid);
+    const auto it = oldest.find(groupOf[id]);
+    if (it == oldest.end() || age < it->second.first) oldest[groupOf[id]] = {age, id};
   }
   for (auto& [id, p] : byId) {
     const auto parent = idOfPid.find(p.ppid);
     p.parentUniqueid = parent == idOfPid.end() ? 0 : parent->second;
     if (!p.unit.empty()) {
-      p.responsibleUniqueid = oldest[p.unit].second;
+      p.responsibleUniqueid = oldest[groupOf[id]].second;
       p.responsiblePid = byId.at(p.responsibleUniqueid).pid;
     }
   }

@@ -8,8 +8,9 @@
 //   manager (the service manager's binary running a user@ unit) is
 //   "com.vexil.launchd.peruser";
 // - unit: the systemd unit of the process's cgroup (last ".service" or
-//   ".scope" component), empty outside units;
-// - responsible: the oldest process of the same unit (0 outside units).
+//   ".scope" component; a user manager's own scope is named by its user@
+//   service), empty outside units;
+// - responsible: the oldest process of the same unit's cgroup (0 outside units).
 // CPU times in ns; start time in absolute ms (the kernel counts it with
 // sleep included: `asleepMs` is taken off).
 #include <cstdint>
