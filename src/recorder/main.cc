@@ -142,6 +142,13 @@ int main(int argc, char** argv) {
     return 64;
   }
 
+  // Termination is handled by the loop, also when it comes during start-up.
+  sigset_t mask;
+  sigemptyset(&mask);
+  sigaddset(&mask, SIGTERM);
+  sigaddset(&mask, SIGINT);
+  sigprocmask(SIG_BLOCK, &mask, nullptr);
+
   ::mkdir(settings.store.c_str(), 0755);
   const MachineFiles machine(settings.root);
   const auto boot = loadBootIdentity(machine, settings.store + "/recorder.state");
@@ -165,11 +172,6 @@ int main(int argc, char** argv) {
   Recorder recorder(machine, clock, log, settings.processEvery);
   sd_event* event = nullptr;
   sd_event_default(&event);
-  sigset_t mask;
-  sigemptyset(&mask);
-  sigaddset(&mask, SIGTERM);
-  sigaddset(&mask, SIGINT);
-  sigprocmask(SIG_BLOCK, &mask, nullptr);
 
   Loop loop{&log, &recorder, nullptr, static_cast<std::uint64_t>(settings.intervalSeconds * 1e6), -1};
   sd_event_add_signal(event, nullptr, SIGTERM, onTerminate, &loop);

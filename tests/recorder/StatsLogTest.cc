@@ -5,11 +5,11 @@
 #include <filesystem>
 #include <fstream>
 
+#include "RecorderFixture.h"
 #include "Records/DateChange.h"
 #include "Records/LogStartsV1.h"
 #include "Records/TimeChange.h"
 #include "Records/UserIdle.h"
-#include "RecorderFixture.h"
 #include "recorder/StatsLog.h"
 #include "store/StatsFileWriter.h"
 
@@ -103,9 +103,9 @@ TEST(RecorderStatsLog, RotatesAndAnnouncesClockZoneAndDateChanges) {
   const StoreContents contents(store.path());
   std::vector<std::string> classes;
   for (const Record* r : contents.records) classes.push_back(r->className());
-  EXPECT_EQ(classes, (std::vector<std::string>{"LogStartsV1", "TimeChange", "UserIdle", "UserIdle", "LogStartsV1",
-                                               "TimeChange", "UserIdle", "DateChange", "TimeChange", "TimeChange",
-                                               "UserIdle"}));
+  EXPECT_EQ(classes,
+            (std::vector<std::string>{"LogStartsV1", "TimeChange", "UserIdle", "UserIdle", "LogStartsV1", "TimeChange",
+                                      "UserIdle", "DateChange", "TimeChange", "TimeChange", "UserIdle"}));
   const auto date = contents.all<DateChange>();
   EXPECT_EQ(date[0]->newYday(), 301u);
   const auto times = contents.all<TimeChange>();
