@@ -7,6 +7,7 @@
 #include <systemd/sd-event.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <cerrno>
 #include <cstdio>
 #include <cstdlib>
@@ -69,7 +70,13 @@ int onTick(sd_event_source* source, std::uint64_t, void* data) {
   auto* loop = static_cast<Loop*>(data);
   loop->recorder->tick();
   if (loop->bus) loop->bus->checkIdle();
-  sd_event_source_set_time_relative(source, loop->intervalUs);
+  // The next tick counts from this one's due time, so the cadence doesn't drift.
+  std::uint64_t due = 0;
+  sd_event_source_get_time(source, &due);
+  std::uint64_t now = 0;
+  sd_event_now(sd_event_source_get_event(source), CLOCK_MONOTONIC, &now);
+  // A tick that overran is not made up for.
+  sd_event_source_set_time(source, std::max(due + loop->intervalUs, now));
   sd_event_source_set_enabled(source, SD_EVENT_ONESHOT);
   return 0;
 }
@@ -181,7 +188,7 @@ int main(int argc, char** argv) {
   loop.bus = bus.get();
 
   recorder.begin();
-  sd_event_add_time_relative(event, nullptr, CLOCK_MONOTONIC, loop.intervalUs, loop.intervalUs / 10, onTick, &loop);
+  sd_event_add_time_relative(event, nullptr, CLOCK_MONOTONIC, loop.intervalUs, loop.intervalUs / 100, onTick, &loop);
   loop.clockFd = timerfd_create(CLOCK_REALTIME, TFD_CLOEXEC | TFD_NONBLOCK);
   armMidnight(loop.clockFd, clock);
   sd_event_add_io(event, nullptr, loop.clockFd, EPOLLIN, onClock, &loop);
