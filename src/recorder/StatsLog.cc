@@ -91,6 +91,7 @@ bool StatsLog::write(const Record& record) {
     file_.reset();  // flushed and closed
     // The reader drops records stamped before their file's header.
     if (!openFile(std::min(absolute, record.absoluteTime()))) return false;
+    fileStart_ = absolute;  // the next rotation counts from now, however old the record
   }
   if (file_->append(record)) return true;
   ++failures_;

@@ -117,6 +117,20 @@ TEST(RecorderStatsLog, RotatesAndAnnouncesClockZoneAndDateChanges) {
   EXPECT_EQ(log.wallAt(log.now()), clock.wall);
 }
 
+TEST(RecorderStatsLog, ASlowBatchBeginsOneFileNotOnePerRecord) {
+  TempDir store;
+  FakeClock clock;
+  StatsLog log(store.path(), recorder::BootIdentity{kBoot, "6.1.0"}, clock, /*rotateMs=*/60'000);
+  ASSERT_TRUE(log.start());
+  const std::uint64_t stamp = log.now();
+  clock.advance(70'000);  // the batch, stamped at its start, took longer than a file lasts
+  for (int i = 0; i < 5; ++i) ASSERT_TRUE(log.write(idleAt(stamp)));
+  log.flush();
+  EXPECT_EQ(statsFiles(store.path()).size(), 2u);
+  const StoreContents contents(store.path());
+  EXPECT_EQ(contents.all<UserIdle>().size(), 5u);  // none stamped before its file's header
+}
+
 // The encoded bytes of a few records, as the recorder writes them.
 std::string encodedRecords(int count) {
   StatsFileWriter w;
