@@ -60,10 +60,10 @@ struct Loop {
 };
 
 void armMidnight(int fd, const Clock& clock) {
-  itimerspec spec{};
+  itimerspec timer{};
   const std::uint64_t midnight = nextLocalMidnight(clock.wallMs());
-  spec.it_value.tv_sec = static_cast<time_t>(midnight / 1000);
-  timerfd_settime(fd, TFD_TIMER_ABSTIME | TFD_TIMER_CANCEL_ON_SET, &spec, nullptr);
+  timer.it_value.tv_sec = static_cast<time_t>(midnight / 1000);
+  timerfd_settime(fd, TFD_TIMER_ABSTIME | TFD_TIMER_CANCEL_ON_SET, &timer, nullptr);
 }
 
 int onTick(sd_event_source* source, std::uint64_t, void* data) {
