@@ -17,6 +17,11 @@ class DeviceChange final : public Record {
  public:
   BW_RECORD_INTERFACE(DeviceChange, BW_DEVICE_CHANGE_FIELDS, BW_NO_REPEATED_FIELDS)
 
+  // The `deviceType` codes the summarizers follow.
+  static constexpr std::uint32_t kWiFi = 5;
+  static constexpr std::uint32_t kBluetooth = 6;
+  static constexpr std::uint32_t kDiscreteGraphics = 9;
+
   // "DeviceChange\t%u\t %@ (@%@)\t%sconnected": deviceType, deviceName,
   // deviceId, then "dis" when nowConnected is 0. Absent strings print empty.
   std::optional<std::string> prettyPrint() const override;

@@ -23,6 +23,10 @@ class LogStartsV1 final : public Record {
  public:
   BW_RECORD_INTERFACE(LogStartsV1, BW_LOG_STARTS_V1_FIELDS, BW_NO_REPEATED_FIELDS)
 
+  // The `writer` that writes a single file per boot: a second such file for
+  // one boot is an inconsistency.
+  static constexpr std::uint64_t kSingleFileWriter = 5;
+
   // The record carries a wall time of its own.
   bool answersWallTime() const override { return true; }
 

@@ -7,7 +7,7 @@ namespace bw {
 BW_RECORD_DEFINE(PowerStateChange, BW_POWER_STATE_CHANGE_FIELDS, BW_NO_REPEATED_FIELDS)
 
 std::optional<std::string> PowerStateChange::prettyPrint() const {
-  return std::string("PowerStateChange\t") + (change() != 0 ? "Battery" : "A/C");
+  return std::string("PowerStateChange\t") + (change() != kOnAC ? "Battery" : "A/C");
 }
 
 }  // namespace bw

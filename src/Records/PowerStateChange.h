@@ -15,6 +15,10 @@ class PowerStateChange final : public Record {
  public:
   BW_RECORD_INTERFACE(PowerStateChange, BW_POWER_STATE_CHANGE_FIELDS, BW_NO_REPEATED_FIELDS)
 
+  // The `change` codes (the one-line text takes any other value as battery).
+  static constexpr std::uint64_t kOnAC = 0;
+  static constexpr std::uint64_t kOnBattery = 1;
+
   // The record carries a wall time of its own.
   bool answersWallTime() const override { return true; }
   // "PowerStateChange\tA/C" when change is 0, "PowerStateChange\tBattery"

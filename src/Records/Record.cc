@@ -10,29 +10,9 @@ namespace bw {
 
 const char* recordClassName(RecordClass c) {
   static const char* const kNames[] = {
-      "LogStartsV0",
-      "LogStartsV1",
-      "BatteryChargeLevel",
-      "PackageEnergyStatistics",
-      "ProcessUsage",
-      "PowerStateChange",
-      "SleepWake",
-      "TimeChange",
-      "DateChange",
-      "UserIdle",
-      "DeviceChange",
-      "Interrupts",
-      "InterruptVector",
-      "SystemMemory",
-      "BluetoothPowerResidency",
-      "SystemIO",
-      "Cstates",
-      "Cstate",
-      "DisplayBrightness",
-      "FanState",
-      "SmcKeys",
-      "SmcKey",
-      "PanelSelfRefresh",
+#define BW_RECORD_NAME(name, ...) #name,
+      BW_RECORD_CLASSES(BW_RECORD_NAME)
+#undef BW_RECORD_NAME
   };
   return kNames[static_cast<int>(c)];
 }

@@ -8,6 +8,7 @@
 #include <optional>
 #include <string>
 
+#include "Records/RecordClasses.h"
 #include "base/Value.h"
 
 namespace google::protobuf::io {
@@ -17,34 +18,16 @@ class CodedOutputStream;
 
 namespace bw {
 
-// One tag per message class. The order is not the stream's type numbers
-// (see the record reader's type table for those).
+// One tag per message class, in the order of Records/RecordClasses.h (not
+// the stream's type numbers: see the record reader's type table for those).
 enum class RecordClass : std::uint8_t {
-  LogStartsV0,
-  LogStartsV1,
-  BatteryChargeLevel,
-  PackageEnergyStatistics,
-  ProcessUsage,
-  PowerStateChange,
-  SleepWake,
-  TimeChange,
-  DateChange,
-  UserIdle,
-  DeviceChange,
-  Interrupts,
-  InterruptVector,
-  SystemMemory,
-  BluetoothPowerResidency,
-  SystemIO,
-  Cstates,
-  Cstate,
-  DisplayBrightness,
-  FanState,
-  SmcKeys,
-  SmcKey,
-  PanelSelfRefresh,
+#define BW_RECORD_TAG(name, ...) name,
+  BW_RECORD_CLASSES(BW_RECORD_TAG)
+#undef BW_RECORD_TAG
 };
-inline constexpr int kRecordClassCount = 23;
+#define BW_RECORD_COUNT(name, ...) +1
+inline constexpr int kRecordClassCount = 0 BW_RECORD_CLASSES(BW_RECORD_COUNT);
+#undef BW_RECORD_COUNT
 
 // The class's name as printed ("SleepWake", "LogStartsV1", ...).
 const char* recordClassName(RecordClass c);

@@ -45,38 +45,10 @@ constexpr ClassEntry entry() {
 
 // In RecordClass order.
 constexpr ClassEntry kClasses[] = {
-    entry<LogStartsV0>(),
-    entry<LogStartsV1>(),
-    entry<BatteryChargeLevel>(),
-    entry<PackageEnergyStatistics>(),
-    entry<ProcessUsage>(),
-    entry<PowerStateChange>(),
-    entry<SleepWake>(),
-    entry<TimeChange>(),
-    entry<DateChange>(),
-    entry<UserIdle>(),
-    entry<DeviceChange>(),
-    entry<Interrupts>(),
-    entry<InterruptVector>(),
-    entry<SystemMemory>(),
-    entry<BluetoothPowerResidency>(),
-    entry<SystemIO>(),
-    entry<Cstates>(),
-    entry<Cstate>(),
-    entry<DisplayBrightness>(),
-    entry<FanState>(),
-    entry<SmcKeys>(),
-    entry<SmcKey>(),
-    entry<PanelSelfRefresh>(),
+#define BW_RECORD_ENTRY(name, ...) entry<name>(),
+    BW_RECORD_CLASSES(BW_RECORD_ENTRY)
+#undef BW_RECORD_ENTRY
 };
-static_assert(std::size(kClasses) == kRecordClassCount);
-
-constexpr bool inTagOrder() {
-  for (std::size_t i = 0; i < std::size(kClasses); ++i)
-    if (static_cast<std::size_t>(kClasses[i].recordClass) != i) return false;
-  return true;
-}
-static_assert(inTagOrder(), "the table must follow RecordClass");
 
 const ClassEntry& entryOf(RecordClass c) { return kClasses[static_cast<std::size_t>(c)]; }
 

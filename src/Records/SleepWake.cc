@@ -7,8 +7,8 @@ namespace bw {
 BW_RECORD_DEFINE(SleepWake, BW_SLEEP_WAKE_FIELDS, BW_NO_REPEATED_FIELDS)
 
 std::optional<std::string> SleepWake::prettyPrint() const {
-  if (reason() == 0) return std::string("Sleep");
-  std::string text = reason() == 2 ? "DarkWake" : "Wake";
+  if (reason() == kSleep) return std::string("Sleep");
+  std::string text = reason() == kDarkWake ? "DarkWake" : "Wake";
   if (wakeFromStandby()) text += " from Standby";
   return text + " (" + wakeType() + ")";
 }

@@ -28,6 +28,11 @@ class SleepWake final : public Record {
  public:
   BW_RECORD_INTERFACE(SleepWake, BW_SLEEP_WAKE_FIELDS, BW_NO_REPEATED_FIELDS)
 
+  // The `reason` codes.
+  static constexpr std::uint32_t kSleep = 0;
+  static constexpr std::uint32_t kWake = 1;
+  static constexpr std::uint32_t kDarkWake = 2;
+
   // The record carries a wall time of its own.
   bool answersWallTime() const override { return true; }
   // "Sleep" when reason is 0; otherwise "DarkWake" (reason 2) or "Wake",

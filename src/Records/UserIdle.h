@@ -12,6 +12,10 @@ class UserIdle final : public Record {
  public:
   BW_RECORD_INTERFACE(UserIdle, BW_USER_IDLE_FIELDS, BW_NO_REPEATED_FIELDS)
 
+  // The `change` codes (the one-line text takes any other value as idle).
+  static constexpr std::uint64_t kActive = 0;
+  static constexpr std::uint64_t kIdle = 1;
+
   // "UserIdle\tIdle" when change is non-zero, "UserIdle\tActive" when 0.
   std::optional<std::string> prettyPrint() const override;
 

@@ -8,6 +8,8 @@
 
 #include <fstream>
 
+#include "base/SystemLog.h"
+
 namespace bw {
 
 std::int64_t SystemPlatform::nowMicroseconds() const {
@@ -42,19 +44,8 @@ std::string SystemPlatform::ownStoreDirectory() const { return "/var/db/brindlew
 std::string SystemPlatform::launchdStoreDirectory() const { return "/var/log/com.vexil.launchd"; }
 std::string SystemPlatform::logDirectory() const { return "/var/log/"; }
 
-namespace {
-void logLine(int priority, const std::string& message) {
-  static bool opened = [] {
-    openlog("brindlewick", LOG_PID, LOG_USER);
-    return true;
-  }();
-  (void)opened;
-  syslog(priority, "%s", message.c_str());
-}
-}  // namespace
-
-void SystemPlatform::systemLog(const std::string& message) { logLine(LOG_NOTICE, message); }
-void SystemPlatform::assumptionLog(const std::string& message) { logLine(LOG_INFO, message); }
+void SystemPlatform::systemLog(const std::string& message) { writeSystemLog(LOG_NOTICE, message); }
+void SystemPlatform::assumptionLog(const std::string& message) { writeSystemLog(LOG_INFO, message); }
 
 namespace {
 Platform* gInstalled = nullptr;

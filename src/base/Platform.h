@@ -39,7 +39,8 @@ class Platform {
   virtual void assumptionLog(const std::string& message) = 0;
 };
 
-// The machine itself: /proc, uname, syslog(3) and the real store paths.
+// The machine itself: /proc, uname, the journal (or syslog) and the real
+// store paths.
 class SystemPlatform : public Platform {
  public:
   std::int64_t nowMicroseconds() const override;

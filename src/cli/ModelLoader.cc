@@ -1,7 +1,11 @@
 #include "cli/ModelLoader.h"
 
+#include "base/Console.h"
 #include "cli/Options.h"
+#include "cli/StoreWatch.h"
 #include "model/Model.h"
+#include "store/RecordReader.h"
+#include "time/BootSequencer.h"
 
 namespace bw {
 
@@ -29,6 +33,28 @@ bool feedsSummarizers(const Options& options) {
   return options.mode() != kModeDump && options.mode() != kModeShowEvents;
 }
 
-std::vector<std::unique_ptr<Model>> loadModels(const Options& options) { return loadModels(storeQuery(options)); }
+FileList runFileList(const StoreQuery& query, ReadObserver* observer) {
+  FileList files = statsFileList(query, observer);
+  if (query.fromPath && files.empty()) exitWithMessage(66, "--from path contained no Brindlewick trace files.");
+  return files;
+}
+
+std::vector<std::unique_ptr<Model>> loadModels(const Options& options, StoreWatch* outerWatch) {
+  const StoreQuery query = storeQuery(options);
+  StoreWatch ownWatch;
+  StoreWatch& watch = outerWatch ? *outerWatch : ownWatch;
+  const FileList files = runFileList(query, &watch);
+  watch.begin(files.size());
+  RecordsByBoot read = readStatsFiles(std::vector<std::string>(files.begin(), files.end()), query, &watch);
+  watch.step("sequencing boots");
+  auto pool = std::make_shared<RecordPool>(std::move(read.pool));
+  std::vector<std::unique_ptr<Model>> models;
+  for (auto& [version, timeline] : sequenceBoots(read.boots)) {
+    auto model = std::make_unique<Model>(std::move(timeline), version);
+    model->retainRecords(pool);
+    models.push_back(std::move(model));
+  }
+  return models;
+}
 
 }  // namespace bw

@@ -6,12 +6,14 @@
 #include <vector>
 
 #include "domains/DomainSpec.h"
-#include "model/ModelLoading.h"
+#include "store/StatsFileList.h"
+#include "store/StoreQuery.h"
 
 namespace bw {
 
 class Model;
 class Options;
+class StoreWatch;
 
 StoreQuery storeQuery(const Options& options);
 DomainSpec domainSpec(const Options& options);
@@ -19,7 +21,16 @@ DomainSpec domainSpec(const Options& options);
 // need only the domains.
 bool feedsSummarizers(const Options& options);
 
-// loadModels(storeQuery(options)).
-std::vector<std::unique_ptr<Model>> loadModels(const Options& options);
+// The stats files of the run. A `--from` directory without any ends the run
+// with "--from path contained no Brindlewick trace files." (status 66).
+// `observer` hears of folders that could not be listed.
+FileList runFileList(const StoreQuery& query, ReadObserver* observer = nullptr);
+
+// Reads the store the options select and builds one model per system
+// version, each holding its boots in sequence; nothing is fed yet. A person
+// at a terminal sees the reading's progress and damage (cli/StoreWatch.h);
+// a caller that passes its own `watch` keeps the progress line up through
+// its later steps and ends it itself.
+std::vector<std::unique_ptr<Model>> loadModels(const Options& options, StoreWatch* watch = nullptr);
 
 }  // namespace bw

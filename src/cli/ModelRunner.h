@@ -15,6 +15,12 @@ class Options;
 
 using ModelAction = std::function<void(const Model& model, const std::vector<Range>& ranges)>;
 
+// The -S state names are checked first, before anything is read. When no
+// model reaches the action, a person at a terminal is told why.
 void runPerModel(const Options& options, const ModelAction& action);
+
+// Ends the run with "no such summarizer: NAME" (an invalid-argument
+// exception) for a -S state name that no model could have.
+void checkMaskStates(const Options& options);
 
 }  // namespace bw

@@ -9,9 +9,11 @@
 #include "Records/PowerStateChange.h"
 #include "Records/SleepWake.h"
 #include "base/Console.h"
+#include "cli/EmptyResult.h"
 #include "cli/ModelLoader.h"
 #include "cli/ModelRunner.h"
 #include "cli/Options.h"
+#include "cli/StoreWatch.h"
 #include "domains/Domain.h"
 #include "domains/WallTimeText.h"
 #include "model/Model.h"
@@ -21,13 +23,22 @@ namespace bw {
 
 void runRecordDump(const Options& options) {
   std::ostream& o = out();
-  for (const std::unique_ptr<Model>& model : loadModels(options)) {
+  StoreWatch watch;
+  const std::vector<std::unique_ptr<Model>> models = loadModels(options, &watch);
+  EmptyStage reached = EmptyStage::kNoRecords;
+  bool printed = false;
+  std::size_t fed = 0;
+  for (const std::unique_ptr<Model>& model : models) {
+    if (!printed) watch.step(format("feeding model %zu of %zu", ++fed, models.size()));
     std::unique_ptr<Domain> domain = Domain::domainWithSpec(domainSpec(options));
     model->processEventsWithDomains({domain.get()}, feedsSummarizers(options));
+    reached = EmptyStage::kNoRange;
     if (domain->ranges().empty()) continue;
     std::optional<Uuid> shownBoot;  // starts afresh for every model
     model->timeline().enumerateEventsInRelativeRanges(
         domain->ranges(), [&](const Record& event, std::uint64_t, std::uint64_t, const AbsTime& absTime, bool&) {
+          if (!printed) watch.end();
+          printed = true;
           if (shownBoot != absTime.boot) {
             shownBoot = absTime.boot;
             o << "===== Boot " << absTime.boot.string() << " =====\n";
@@ -35,6 +46,8 @@ void runRecordDump(const Options& options) {
           o << event.className() << ' ' << describeValue(Value(event.dictionaryRepresentation())) << '\n';
         });
   }
+  watch.end();
+  if (!printed) noteEmptyResult(options, models, reached);
 }
 
 void runEventListing(const Options& options) {
@@ -90,13 +103,13 @@ void plotModel(const Model& model) {
       [&](const Record& event, std::uint64_t position, std::uint64_t, const AbsTime&, bool&) {
         if (event.recordClass() != RecordClass::SleepWake) return;
         switch (static_cast<const SleepWake&>(event).reason()) {
-          case 0:
+          case SleepWake::kSleep:
             plotLine(o, position, 100);
             break;
-          case 2:
+          case SleepWake::kDarkWake:
             plotLine(o, position, 50);
             break;
-          case 1:
+          case SleepWake::kWake:
             plotLine(o, position, 0);
             break;
           default:
@@ -109,11 +122,11 @@ void plotModel(const Model& model) {
       });
 
   o << '\n';
-  timeline.enumerateEventsUsingBlock(
-      [&](const Record& event, std::uint64_t position, std::uint64_t, const AbsTime&, bool&) {
-        if (event.recordClass() != RecordClass::PowerStateChange) return;
-        plotLine(o, position, static_cast<const PowerStateChange&>(event).change() != 0 ? 0 : 100);
-      });
+  timeline.enumerateEventsUsingBlock([&](const Record& event, std::uint64_t position, std::uint64_t, const AbsTime&,
+                                         bool&) {
+    if (event.recordClass() != RecordClass::PowerStateChange) return;
+    plotLine(o, position, static_cast<const PowerStateChange&>(event).change() != PowerStateChange::kOnAC ? 0 : 100);
+  });
 }
 
 }  // namespace

@@ -4,10 +4,12 @@
 
 #include "base/Console.h"
 #include "base/Exception.h"
+#include "base/Terminal.h"
 #include "cli/ModelLoader.h"
 #include "cli/OptionParser.h"
 #include "cli/Options.h"
 #include "cli/RecordModes.h"
+#include "cli/StoreWatch.h"
 #include "service/AnalysisService.h"
 
 namespace bw {
@@ -19,7 +21,8 @@ void listFiles(const Options& options) {
   query.periodicCutoff = Date::distantPast();
   const char separator = options.listfileswithnull() ? '\0' : '\n';
   std::ostream& o = out();
-  for (const std::string& path : runFileList(query)) {
+  StoreWatch watch;  // tells a person at a terminal of folders it could not list
+  for (const std::string& path : runFileList(query, &watch)) {
     o << path;
     o.put(separator);
   }
@@ -54,20 +57,31 @@ void dispatch(const Options& options) {
   }
 }
 
+namespace {
+
+// The end of a run: standard output flushed, the store's damage summed up
+// for a person at a terminal.
+int finishRun(int status) {
+  out().flush();
+  printRunDamage();
+  return status;
+}
+
+}  // namespace
+
 int runMain(int argc, char** argv) {
   try {
     Options options = parseOptions(argc, argv);
     dispatch(options);
-    out().flush();
-    return 0;
+    return finishRun(0);
   } catch (const ProcessExit& e) {
-    out().flush();
-    return e.status;
+    return finishRun(e.status);
   } catch (const Exception& e) {
     out().flush();
+    clearTransientLine();
     err() << "brindlewick: *** uncaught exception " << e.name() << ": " << e.reason() << "\n";
     err().flush();
-    return 70;
+    return finishRun(70);
   }
 }
 

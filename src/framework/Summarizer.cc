@@ -37,7 +37,7 @@ void Summarizer::addEvent(const Record& event, std::uint64_t position, const Abs
   }
 
   if (endAtSleep_ && event.recordClass() == RecordClass::SleepWake &&
-      static_cast<const SleepWake&>(event).reason() == 0) {
+      static_cast<const SleepWake&>(event).reason() == SleepWake::kSleep) {
     endRangeAtPosition(position);
   }
 

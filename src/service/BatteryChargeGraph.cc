@@ -8,7 +8,7 @@
 #include "base/Platform.h"
 #include "domains/AllDomain.h"
 #include "model/Model.h"
-#include "model/ModelLoading.h"
+#include "service/StoreModels.h"
 #include "summarizers/BatterySummarizer.h"
 
 namespace bw {
@@ -23,7 +23,7 @@ constexpr std::uint64_t kWallTimeTolerance = 5000;
 
 MessageDictionary batteryChargeGraph(StoreQuery query) {
   if (!query.onlySystemVersion) query.onlySystemVersion = platform().currentSystemVersion();
-  std::vector<std::unique_ptr<Model>> models = loadModels(query);
+  std::vector<std::unique_ptr<Model>> models = loadStoreModels(query);
   if (models.size() != 1) throw Exception(kInternalInconsistencyException, "multiple system versions detected");
   Model& model = *models.front();
   AllDomain domain;

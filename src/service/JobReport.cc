@@ -8,7 +8,7 @@
 #include "base/Platform.h"
 #include "domains/Domain.h"
 #include "model/Model.h"
-#include "model/ModelLoading.h"
+#include "service/StoreModels.h"
 #include "summarizers/ProcessSummary.h"
 #include "time/AbsRange.h"
 
@@ -43,7 +43,7 @@ struct ModelRanges {
 // boot whose domain has ranges.
 ModelRanges modelInDomain(const StoreQuery& query, const DomainSpec& spec) {
   ModelRanges found;
-  for (std::unique_ptr<Model>& model : loadModels(query)) {
+  for (std::unique_ptr<Model>& model : loadStoreModels(query)) {
     std::unique_ptr<Domain> domain = Domain::domainWithSpec(spec);
     model->processEventsWithDomains({domain.get()}, true);
     if (domain->ranges().empty()) continue;

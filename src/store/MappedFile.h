@@ -16,6 +16,8 @@ class MappedFile {
   MappedFile& operator=(const MappedFile&) = delete;
 
   bool ok() const { return ok_; }
+  // The errno value of the failure when not ok() (EISDIR for a non-file).
+  int error() const { return error_; }
   const std::uint8_t* data() const { return data_; }
   std::size_t size() const { return size_; }
 
@@ -24,6 +26,7 @@ class MappedFile {
   std::size_t size_ = 0;
   bool ok_ = false;
   bool mapped_ = false;
+  int error_ = 0;
 };
 
 }  // namespace bw

@@ -112,7 +112,11 @@ Uuid bootOf(const Record* header) { return asHeader(header).bootUUID().value_or(
 
 FileRecords readStatsFile(const std::string& path, const StoreQuery& query, RecordPool& pool) {
   MappedFile file(path);
-  if (!file.ok()) return FileRecords();
+  if (!file.ok()) {
+    FileRecords unread;
+    unread.openError = file.error();
+    return unread;
+  }
   return readStatsData(file.data(), file.size(), path, query, pool);
 }
 
@@ -192,6 +196,7 @@ FileRecords readStatsData(const std::uint8_t* data, std::size_t size, const std:
       // Nothing was collected yet: the file is dropped without marking a boot.
       pool.rewind(fileStart);
       result.records.clear();
+      result.undecodable = true;
     }
   }
   return result;
@@ -211,7 +216,7 @@ class BootGrouper {
     std::vector<Record*>& bootRecords = out_.boots[boot];
     bootRecords.insert(bootRecords.end(), file.records.begin(), file.records.end());
     if (file.damaged) damaged_.push_back(boot);
-    if (asHeader(first).writer() == 5) {
+    if (asHeader(first).writer() == LogStartsV1::kSingleFileWriter) {
       if (!writerFiveSeen_.insert(boot).second) {
         throw Exception(kInternalInconsistencyException, "duplicate boot uuid detected");
       }
@@ -235,9 +240,13 @@ class BootGrouper {
 
 }  // namespace
 
-RecordsByBoot readStatsFiles(const std::vector<std::string>& paths, const StoreQuery& query) {
+RecordsByBoot readStatsFiles(const std::vector<std::string>& paths, const StoreQuery& query, ReadObserver* observer) {
   BootGrouper grouper;
-  for (const std::string& path : paths) grouper.add(readStatsFile(path, query, grouper.pool()));
+  for (const std::string& path : paths) {
+    FileRecords file = readStatsFile(path, query, grouper.pool());
+    if (observer) observer->fileRead(path, file);
+    grouper.add(std::move(file));
+  }
   return grouper.finish();
 }
 

@@ -15,6 +15,7 @@
 #include <vector>
 
 #include "base/Uuid.h"
+#include "store/ReadObserver.h"
 #include "store/RecordPool.h"
 #include "store/StoreQuery.h"
 
@@ -34,6 +35,8 @@ struct RecordsByBoot {
 struct FileRecords {
   std::vector<Record*> records;  // empty when the file was dropped
   bool damaged = false;          // decoding failed after the header was read
+  bool undecodable = false;      // decoding failed before any record was kept
+  int openError = 0;             // errno when the file could not be opened
 };
 
 // Reads one file into `pool`, applying the per-file rules. A file that
@@ -47,8 +50,9 @@ FileRecords readStatsData(const std::uint8_t* data, std::size_t size, const std:
 
 // Reads the given files, in the given order, and groups them by boot. Raises
 // "duplicate boot uuid detected" when a boot has two files written by
-// writer 5.
-RecordsByBoot readStatsFiles(const std::vector<std::string>& paths, const StoreQuery& query);
+// writer 5. `observer`, when given, hears of every file as it is done.
+RecordsByBoot readStatsFiles(const std::vector<std::string>& paths, const StoreQuery& query,
+                             ReadObserver* observer = nullptr);
 
 // Reads the query's file list (an empty store gives no boots).
 RecordsByBoot readAllRecords(const StoreQuery& query);

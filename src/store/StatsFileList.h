@@ -12,6 +12,7 @@
 #include <string>
 
 #include "base/Date.h"
+#include "store/ReadObserver.h"
 #include "store/StoreQuery.h"
 
 namespace bw {
@@ -20,12 +21,15 @@ using FileList = std::set<std::string>;
 
 // The file list for a run; empty when the store has no stats files (the
 // command line tells the user when a `--from` directory held none).
-FileList statsFileList(const StoreQuery& query);
+// `observer`, when given, hears of directories that exist but cannot be
+// listed (they add nothing either way).
+FileList statsFileList(const StoreQuery& query, ReadObserver* observer = nullptr);
 
 // Adds the matching files of `directory` to `files`. Recursive scans match
 // each entry's path relative to `directory` (files and directories alike); a
 // directory that cannot be listed adds nothing.
-void scanDirectory(FileList& files, const std::string& directory, bool recursive, const std::optional<Date>& cutoff);
+void scanDirectory(FileList& files, const std::string& directory, bool recursive, const std::optional<Date>& cutoff,
+                   ReadObserver* observer = nullptr);
 
 // The file's modification date, or none when its attributes cannot be read.
 std::optional<Date> modificationDate(const std::string& path);

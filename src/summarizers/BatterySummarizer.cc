@@ -45,7 +45,7 @@ void BatterySummarizer::addEvent(const Record& event, std::uint64_t position, co
       if (static_cast<const PowerStateChange&>(event).isFullyCharged()) last_fully_charged_time_ = position;
       break;
     case RecordClass::SleepWake:
-      if (static_cast<const SleepWake&>(event).reason() != 0) {
+      if (static_cast<const SleepWake&>(event).reason() != SleepWake::kSleep) {
         wakePos_ = position;
         batteryEventCount_ = 0;
         resetRange();

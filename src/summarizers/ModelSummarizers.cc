@@ -44,4 +44,10 @@ std::vector<std::pair<std::string, std::unique_ptr<Summarizer>>> makeModelSummar
   return all;
 }
 
+std::vector<std::string> modelSummarizerKeys() {
+  std::vector<std::string> keys;
+  for (const auto& entry : makeModelSummarizers()) keys.push_back(entry.first);
+  return keys;
+}
+
 }  // namespace bw

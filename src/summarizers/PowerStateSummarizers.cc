@@ -45,17 +45,25 @@ void configureDevice(Summarizer& s, const char* identifier, std::uint32_t device
 
 }  // namespace
 
-ACPowerSummarizer::ACPowerSummarizer() { configureCode<PowerStateChange>(*this, "ACPower", !kStartAtBoot, 0); }
-BatteryPowerSummarizer::BatteryPowerSummarizer() {
-  configureCode<PowerStateChange>(*this, "BatteryPower", !kStartAtBoot, 1);
+ACPowerSummarizer::ACPowerSummarizer() {
+  configureCode<PowerStateChange>(*this, "ACPower", !kStartAtBoot, PowerStateChange::kOnAC);
 }
-SleepSummarizer::SleepSummarizer() { configureCode<SleepWake>(*this, "Sleep", !kStartAtBoot, 0); }
-WakeSummarizer::WakeSummarizer() { configureCode<SleepWake>(*this, "Wake", kStartAtBoot, 1); }
-DarkWakeSummarizer::DarkWakeSummarizer() { configureCode<SleepWake>(*this, "DarkWake", !kStartAtBoot, 2); }
-UserActiveSummarizer::UserActiveSummarizer() { configureCode<UserIdle>(*this, "Active", kStartAtBoot, 0); }
-UserIdleSummarizer::UserIdleSummarizer() { configureCode<UserIdle>(*this, "Idle", !kStartAtBoot, 1); }
-WiFiSummarizer::WiFiSummarizer() { configureDevice(*this, "Wi-Fi", 5); }
-BluetoothSummarizer::BluetoothSummarizer() { configureDevice(*this, "Bluetooth", 6); }
-DiscreteGraphicsSummarizer::DiscreteGraphicsSummarizer() { configureDevice(*this, "DiscreteGraphics", 9); }
+BatteryPowerSummarizer::BatteryPowerSummarizer() {
+  configureCode<PowerStateChange>(*this, "BatteryPower", !kStartAtBoot, PowerStateChange::kOnBattery);
+}
+SleepSummarizer::SleepSummarizer() { configureCode<SleepWake>(*this, "Sleep", !kStartAtBoot, SleepWake::kSleep); }
+WakeSummarizer::WakeSummarizer() { configureCode<SleepWake>(*this, "Wake", kStartAtBoot, SleepWake::kWake); }
+DarkWakeSummarizer::DarkWakeSummarizer() {
+  configureCode<SleepWake>(*this, "DarkWake", !kStartAtBoot, SleepWake::kDarkWake);
+}
+UserActiveSummarizer::UserActiveSummarizer() {
+  configureCode<UserIdle>(*this, "Active", kStartAtBoot, UserIdle::kActive);
+}
+UserIdleSummarizer::UserIdleSummarizer() { configureCode<UserIdle>(*this, "Idle", !kStartAtBoot, UserIdle::kIdle); }
+WiFiSummarizer::WiFiSummarizer() { configureDevice(*this, "Wi-Fi", DeviceChange::kWiFi); }
+BluetoothSummarizer::BluetoothSummarizer() { configureDevice(*this, "Bluetooth", DeviceChange::kBluetooth); }
+DiscreteGraphicsSummarizer::DiscreteGraphicsSummarizer() {
+  configureDevice(*this, "DiscreteGraphics", DeviceChange::kDiscreteGraphics);
+}
 
 }  // namespace bw

@@ -8,7 +8,7 @@ namespace bw {
 void StandbySummarizer::addEvent(const Record& event, std::uint64_t position, const AbsTime&, std::uint64_t) {
   if (event.recordClass() != RecordClass::SleepWake) return;
   const auto& record = static_cast<const SleepWake&>(event);
-  if (record.reason() == 0) {
+  if (record.reason() == SleepWake::kSleep) {
     beginRangeAtPosition(position);
     return;
   }
@@ -17,7 +17,7 @@ void StandbySummarizer::addEvent(const Record& event, std::uint64_t position, co
     return;
   }
   endRangeAtPosition(position);
-  const bool dark = record.reason() == 2;
+  const bool dark = record.reason() == SleepWake::kDarkWake;
   auto count = [&](const std::string& key) {
     StandbyContext& context = context_.objectForKey(key);
     context.wakes().addCreditAtPosition(position);

@@ -4,9 +4,9 @@
 
 #include "Records/PackageEnergyStatistics.h"
 #include "Records/SystemIO.h"
+#include "cli/ModelLoader.h"
 #include "cli/Options.h"
 #include "cli/RecordModesStore.h"
-#include "cli/ModelLoader.h"
 #include "model/Model.h"
 #include "summarizers/CPUSummary.h"
 #include "summarizers/IOSummary.h"

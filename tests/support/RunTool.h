@@ -16,6 +16,9 @@ struct ToolResult {
 struct RunSettings {
   std::map<std::string, std::string> env;  // added to (or replacing in) the environment
   bool asUnprivilegedUser = false;         // drop to uid/gid 65534 when running as root
+  // Standard error on a pseudo-terminal (raw, so its bytes arrive unchanged)
+  // instead of a file; standard output stays a file either way.
+  bool stderrOnTerminal = false;
 };
 
 ToolResult runBinary(const std::string& binary, const std::vector<std::string>& args, const RunSettings& settings = {});

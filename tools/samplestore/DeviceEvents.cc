@@ -18,9 +18,9 @@ constexpr std::uint32_t kStorage = 1;
 constexpr std::uint32_t kKeyboard = 2;
 constexpr std::uint32_t kAudio = 3;
 constexpr std::uint32_t kDisplay = 4;
-constexpr std::uint32_t kWiFi = 5;
-constexpr std::uint32_t kBluetooth = 6;
-constexpr std::uint32_t kDiscreteGpu = 9;
+constexpr std::uint32_t kWiFi = DeviceChange::kWiFi;
+constexpr std::uint32_t kBluetooth = DeviceChange::kBluetooth;
+constexpr std::uint32_t kDiscreteGpu = DeviceChange::kDiscreteGraphics;
 
 struct Device {
   std::uint32_t type;

@@ -18,7 +18,7 @@ constexpr const char* kHeaderVersion = "1.4";
 constexpr std::uint64_t kLaunchdWriter = 1;
 constexpr std::uint64_t kUserLaunchdWriter = 2;
 constexpr std::uint64_t kPeriodicWriter = 3;
-constexpr std::uint64_t kPowerWriter = 5;
+constexpr std::uint64_t kPowerWriter = LogStartsV1::kSingleFileWriter;
 
 std::string rawBytes(const Uuid& uuid) { return std::string(uuid.bytes().begin(), uuid.bytes().end()); }
 

@@ -28,7 +28,7 @@ constexpr std::uint32_t kDayChangedWithZone = 2;
 void addUserIdle(std::uint64_t abs, bool idle, RecordSink& sink) {
   UserIdle u;
   u.setAbsoluteTime(abs);
-  u.setChange(idle ? 1 : 0);
+  u.setChange(idle ? UserIdle::kIdle : UserIdle::kActive);
   sink.add(Stream::Power, u);
 }
 
@@ -71,7 +71,7 @@ void PowerEvents::run(const Boot& boot, const Run& run, RecordSink& sink) {
     SleepWake sleep;
     sleep.setAbsoluteTime(run.absEnd());
     sleep.setWallTime(run.wallEnd());
-    sleep.setReason(0);
+    sleep.setReason(SleepWake::kSleep);
     sink.add(Stream::Power, sleep);
   }
   lastWall_ = std::max(lastWall_, run.wallEnd());
@@ -81,7 +81,7 @@ void PowerEvents::wake(const Run& run, RecordSink& sink) {
   SleepWake w;
   w.setAbsoluteTime(run.absStart);
   w.setWallTime(run.wallStart);
-  w.setReason(run.dark ? 2 : 1);
+  w.setReason(run.dark ? SleepWake::kDarkWake : SleepWake::kWake);
   w.setWakeFromStandby(run.fromStandby);
   w.setWakeType(run.wakeType);
   w.setEfiMsec(static_cast<std::uint64_t>(run.fromStandby ? rng_.between(1'500, 4'000) : rng_.between(250, 900)));
@@ -277,7 +277,7 @@ void PowerEvents::powerStateChange(const Run& run, std::uint64_t abs, bool onAC,
   if (!onAC && battery_.unpluggedAt == 0) battery_.unpluggedAt = run.wallAt(abs);
   PowerStateChange p;
   p.setAbsoluteTime(abs);
-  p.setChange(onAC ? 0 : 1);
+  p.setChange(onAC ? PowerStateChange::kOnAC : PowerStateChange::kOnBattery);
   if (onAC && battery_.full) p.setIsFullyCharged(true);
   p.setWallTime(run.wallAt(abs));
   sink.add(Stream::Power, p);

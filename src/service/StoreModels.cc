@@ -1,20 +1,16 @@
-#include "model/ModelLoading.h"
+#include "service/StoreModels.h"
 
 #include "base/Console.h"
 #include "model/Model.h"
 #include "store/RecordReader.h"
+#include "store/StatsFileList.h"
 #include "time/BootSequencer.h"
 
 namespace bw {
 
-FileList runFileList(const StoreQuery& query) {
-  FileList files = statsFileList(query);
+std::vector<std::unique_ptr<Model>> loadStoreModels(const StoreQuery& query) {
+  const FileList files = statsFileList(query);
   if (query.fromPath && files.empty()) exitWithMessage(66, "--from path contained no Brindlewick trace files.");
-  return files;
-}
-
-std::vector<std::unique_ptr<Model>> loadModels(const StoreQuery& query) {
-  const FileList files = runFileList(query);
   RecordsByBoot read = readStatsFiles(std::vector<std::string>(files.begin(), files.end()), query);
   auto pool = std::make_shared<RecordPool>(std::move(read.pool));
   std::vector<std::unique_ptr<Model>> models;

@@ -1,0 +1,132 @@
+// The recorder killed with SIGKILL at random moments while it writes, 200
+// times: every file stays readable by the project's reader, and each restart
+// cuts at most the one record a kill tore.
+#include <fcntl.h>
+#include <signal.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <cstdlib>
+#include <filesystem>
+#include <map>
+#include <random>
+
+#include "RecorderFixture.h"
+#include "recorder/StatsFile.h"
+
+namespace bw::test {
+namespace {
+
+pid_t startRecorder(const std::string& store) {
+  const pid_t pid = fork();
+  if (pid == 0) {
+    const int null = ::open("/dev/null", O_WRONLY);
+    dup2(null, STDERR_FILENO);
+    // A fast cadence and frequent rotation keep it writing all the time.
+    execl(BRINDLEWICK_RECORDER_BINARY, "brindlewick-recorder", "--store", store.c_str(), "--interval", "0.002",
+          "--process-every", "2", "--rotate", "0.5", "--no-bus", static_cast<char*>(nullptr));
+    _exit(127);
+  }
+  return pid;
+}
+
+std::size_t countFiles(const std::string& dir) {
+  std::size_t n = 0;
+  for (const auto& e : std::filesystem::directory_iterator(dir)) n += e.path().extension() == ".stats";
+  return n;
+}
+
+struct FileCheck {
+  std::uint64_t wholeRecords = 0;
+  std::uint64_t tornBytes = 0;
+  bool readerKeepsAllWhole = false;  // the reader, before any repair, read every whole record
+};
+
+// What a file holds now: its whole records (counted on a repaired copy) and
+// what the reader makes of the file as it is.
+FileCheck check(const std::string& path, const std::string& scratch) {
+  FileCheck c;
+  std::filesystem::copy_file(path, scratch, std::filesystem::copy_options::overwrite_existing);
+  const auto trimmed = recorder::trimTornTail(scratch);
+  c.wholeRecords = trimmed.records;
+  c.tornBytes = trimmed.trimmedBytes;
+  RecordPool pool;
+  const FileRecords read = readStatsFile(path, Options{}, pool);
+  c.readerKeepsAllWhole = !read.damaged && read.records.size() == trimmed.records;
+  return c;
+}
+
+// 200 kills; the sanitizer build, where every start takes a second, asks for fewer.
+int killCount() {
+  const char* wanted = std::getenv("BRINDLEWICK_RECORDER_KILLS");
+  return wanted && std::atoi(wanted) > 0 ? std::atoi(wanted) : 200;
+}
+
+TEST(RecorderCrash, SigkillWhileWritingLosesAtMostTheLastRecord) {
+  const int rounds = killCount();
+  TempDir store;
+  TempDir scratch;
+  std::mt19937 random(18);
+  std::uniform_int_distribution<int> delayUs(0, 40000);
+  std::map<std::string, std::uintmax_t> sizes;
+  std::map<std::string, std::uint64_t> whole;
+  int kills = 0, tornFiles = 0, unreadableBeforeRepair = 0;
+  std::uint64_t tornBytes = 0;
+  for (int i = 0; i < rounds; ++i) {
+    const std::size_t before = countFiles(store.path());
+    const pid_t pid = startRecorder(store.path());
+    ASSERT_GT(pid, 0);
+    // Once it has begun its file, kill it anywhere in what it writes next.
+    for (int wait = 0; wait < 5000 && countFiles(store.path()) == before; ++wait) ::usleep(1000);
+    ::usleep(static_cast<useconds_t>(delayUs(random)));
+    ::kill(pid, SIGKILL);
+    int status = 0;
+    ::waitpid(pid, &status, 0);
+    kills += WIFSIGNALED(status) && WTERMSIG(status) == SIGKILL;
+    for (const auto& e : std::filesystem::directory_iterator(store.path())) {
+      if (e.path().extension() != ".stats") continue;
+      const std::string path = e.path().string();
+      if (sizes[path] == e.file_size() && whole.count(path)) continue;
+      sizes[path] = e.file_size();
+      const FileCheck c = check(path, scratch / "copy.stats");
+      whole[path] = c.wholeRecords;
+      if (c.tornBytes > 0) {
+        ++tornFiles;
+        tornBytes += c.tornBytes;
+      }
+      if (!c.readerKeepsAllWhole) ++unreadableBeforeRepair;
+    }
+  }
+  // One last start repairs what the last kill left, and stops cleanly.
+  const std::size_t before = countFiles(store.path());
+  const pid_t last = startRecorder(store.path());
+  for (int wait = 0; wait < 5000 && countFiles(store.path()) == before; ++wait) ::usleep(1000);
+  ::kill(last, SIGTERM);
+  int status = 0;
+  ::waitpid(last, &status, 0);
+  EXPECT_TRUE(WIFEXITED(status) && WEXITSTATUS(status) == 0);
+
+  std::uint64_t files = 0, records = 0, emptyFiles = 0;
+  for (const auto& [path, count] : whole) {
+    SCOPED_TRACE(path);
+    RecordPool pool;
+    const FileRecords read = readStatsFile(path, Options{}, pool);
+    EXPECT_FALSE(read.damaged);
+    EXPECT_EQ(read.records.size(), count);  // every whole record survived its repair
+    const auto trimmed = recorder::trimTornTail(path);
+    EXPECT_EQ(trimmed.trimmedBytes, 0u);  // nothing torn is left
+    ++files;
+    records += count;
+    emptyFiles += count == 0;  // killed between creating the file and writing its header
+  }
+  EXPECT_EQ(kills, rounds);
+  EXPECT_GE(files, static_cast<std::uint64_t>(rounds));  // a new file at every start
+  std::printf(
+      "[ crash    ] %d kills, %llu files, %llu records kept, %d torn tails (%llu bytes) cut on restart, "
+      "%d files the reader would have damaged before the repair, %llu empty files\n",
+      kills, static_cast<unsigned long long>(files), static_cast<unsigned long long>(records), tornFiles,
+      static_cast<unsigned long long>(tornBytes), unreadableBeforeRepair, static_cast<unsigned long long>(emptyFiles));
+}
+
+}  // namespace
+}  // namespace bw::test

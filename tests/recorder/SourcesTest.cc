@@ -1,0 +1,272 @@
+// Every source against fixture trees of /sys and /proc, through the
+// Recorder, with the records read back from the store by the project's reader.
+#include <fcntl.h>
+#include <unistd.h>
+
+#include "RecorderFixture.h"
+#include "Records/BatteryChargeLevel.h"
+#include "Records/Cstates.h"
+#include "Records/DeviceChange.h"
+#include "Records/DisplayBrightness.h"
+#include "Records/FanState.h"
+#include "Records/Interrupts.h"
+#include "Records/LogStartsV1.h"
+#include "Records/PackageEnergyStatistics.h"
+#include "Records/PowerStateChange.h"
+#include "Records/ProcessUsage.h"
+#include "Records/SystemIO.h"
+#include "Records/SystemMemory.h"
+#include "recorder/CpuSource.h"
+#include "recorder/Recorder.h"
+
+namespace bw::test {
+namespace {
+
+using recorder::BootIdentity;
+
+// A recorder over a fixture tree, writing into a temporary store.
+struct Rig {
+  MachineTree tree;
+  TempDir store;
+  FakeClock clock;
+  recorder::MachineFiles machine{tree.dir.path()};
+  recorder::StatsLog log{store.path(), BootIdentity{*Uuid::parse("11111111-2222-3333-4444-555555555555"), "6.1.0"},
+                         clock};
+  recorder::Recorder recorder{machine, clock, log, 1000};
+
+  Rig() { EXPECT_TRUE(log.start()); }
+  StoreContents contents() {
+    log.flush();
+    return StoreContents(store.path());
+  }
+};
+
+std::uint64_t ticksPerSecond() { return static_cast<std::uint64_t>(sysconf(_SC_CLK_TCK)); }
+
+TEST(RecorderSources, BatteryDischargingThenOnExternalPower) {
+  Rig rig;
+  const std::string bat = "/sys/class/power_supply/BAT0/";
+  rig.tree.put(bat + "type", "Battery\n");
+  rig.tree.put(bat + "status", "Discharging\n");
+  rig.tree.put(bat + "charge_now", "3000000\n");
+  rig.tree.put(bat + "charge_full", "5000000\n");
+  rig.tree.put(bat + "voltage_now", "11400000\n");
+  rig.tree.put(bat + "current_now", "1500000\n");
+  rig.tree.put(bat + "cycle_count", "42\n");
+  rig.tree.put("/sys/class/power_supply/AC/type", "Mains\n");
+  rig.tree.put("/sys/class/power_supply/AC/online", "0\n");
+  // A wireless mouse's battery is not the machine's.
+  rig.tree.put("/sys/class/power_supply/hidpp_battery_0/type", "Battery\n");
+  rig.tree.put("/sys/class/power_supply/hidpp_battery_0/scope", "Device\n");
+  rig.tree.put("/sys/class/power_supply/hidpp_battery_0/charge_now", "100000\n");
+  rig.tree.put("/sys/class/power_supply/hidpp_battery_0/charge_full", "100000\n");
+  rig.recorder.tick();
+  rig.clock.advance(60000);
+  rig.recorder.tick();  // no power change: only the gauge
+  rig.clock.advance(60000);
+  rig.tree.put("/sys/class/power_supply/AC/online", "1\n");
+  rig.tree.put(bat + "status", "Full\n");
+  rig.tree.put(bat + "charge_now", "5000000\n");
+  rig.tree.put(bat + "current_now", "200000\n");
+  rig.recorder.tick();
+
+  const auto store = rig.contents();
+  const auto changes = store.all<PowerStateChange>();
+  ASSERT_EQ(changes.size(), 2u);
+  EXPECT_EQ(changes[0]->change(), 1u);  // battery
+  EXPECT_EQ(changes[1]->change(), 0u);  // external power
+  EXPECT_EQ(changes[1]->absoluteTime(), 5'120'000u);
+  EXPECT_EQ(changes[1]->wallTime(), 1'790'000'120'000u);
+  const auto levels = store.all<BatteryChargeLevel>();
+  ASSERT_EQ(levels.size(), 3u);
+  EXPECT_EQ(levels[0]->charge(), 3000);
+  EXPECT_EQ(levels[0]->maxCharge(), 5000);
+  EXPECT_EQ(levels[0]->cycleCount(), 42);
+  EXPECT_EQ(levels[0]->instantAmperage(), -1500);
+  EXPECT_EQ(levels[0]->instantVoltage(), 11400);
+  EXPECT_FALSE(levels[0]->isFullyCharged());
+  EXPECT_EQ(levels[2]->charge(), 5000);
+  EXPECT_EQ(levels[2]->instantAmperage(), 200);
+  EXPECT_TRUE(levels[2]->isFullyCharged());
+  EXPECT_EQ(levels[2]->absoluteTime(), 5'120'000u);
+}
+
+TEST(RecorderSources, EnergyOnlyBatteryInMilliampHours) {
+  recorder::MachineFiles none("/nonexistent-root");
+  EXPECT_FALSE(recorder::PowerSupplySource(none).read().battery);
+  MachineTree tree;
+  const std::string bat = "/sys/class/power_supply/BAT1/";
+  tree.put(bat + "type", "Battery\n");
+  tree.put(bat + "status", "Discharging\n");
+  tree.put(bat + "energy_now", "45600000\n");  // µWh
+  tree.put(bat + "energy_full", "57000000\n");
+  tree.put(bat + "voltage_now", "11400000\n");  // µV
+  tree.put(bat + "power_now", "11400000\n");    // µW
+  recorder::MachineFiles machine(tree.dir.path());
+  const auto state = recorder::PowerSupplySource(machine).read();
+  ASSERT_TRUE(state.battery);
+  EXPECT_EQ(state.battery->charge(), 4000);
+  EXPECT_EQ(state.battery->maxCharge(), 5000);
+  EXPECT_EQ(state.battery->instantAmperage(), -1000);
+  ASSERT_TRUE(state.external);  // no adapter: a discharging battery means battery power
+  EXPECT_FALSE(*state.external);
+}
+
+// Two CPUs with cpuidle and cpufreq, a RAPL package zone and /proc/stat.
+void writeCpus(const MachineTree& tree, std::uint64_t c0s1, std::uint64_t c0s2, std::uint64_t c1s1, std::uint64_t c1s2,
+               std::uint64_t energy) {
+  const std::uint64_t times[2][2] = {{c0s1, c0s2}, {c1s1, c1s2}};
+  for (int cpu = 0; cpu < 2; ++cpu) {
+    const std::string dir = "/sys/devices/system/cpu/cpu" + std::to_string(cpu) + "/";
+    tree.put(dir + "cpuidle/state0/time", "100\n");
+    tree.put(dir + "cpuidle/state1/time", std::to_string(times[cpu][0]) + "\n");
+    tree.put(dir + "cpuidle/state2/time", std::to_string(times[cpu][1]) + "\n");
+    tree.put(dir + "cpufreq/scaling_cur_freq", cpu == 0 ? "2000000\n" : "3000000\n");
+    tree.put(dir + "cpufreq/base_frequency", "2400000\n");
+  }
+  tree.put("/sys/class/powercap/intel-rapl:0/name", "package-0\n");
+  tree.put("/sys/class/powercap/intel-rapl:0/energy_uj", std::to_string(energy) + "\n");
+  tree.put("/sys/class/powercap/intel-rapl:0/max_energy_range_uj", "1000000\n");
+  tree.put("/sys/class/powercap/intel-rapl:0:0/name", "core\n");  // a subzone: not the package
+  tree.put("/sys/class/powercap/intel-rapl:0:0/energy_uj", "777\n");
+  tree.put("/proc/stat", "cpu  100 50 30 1000 0 0 0 0 0 0\ncpu0 50 25 15 500 0 0 0 0 0 0\n");
+}
+
+TEST(RecorderSources, CpuidleAndRaplCountersMakePackageRecords) {
+  MachineTree tree;
+  writeCpus(tree, 1'000'000, 2'000'000, 1'000'000, 2'000'000, 900'000);
+  recorder::MachineFiles machine(tree.dir.path());
+  recorder::CpuSource cpu(machine);
+  const auto first = cpu.read(1000);
+  ASSERT_TRUE(first.package);
+  EXPECT_EQ(first.package->energyModelMillijoules(), 900u);
+  EXPECT_EQ(first.package->pkgCanyResidency(), 0u);  // counting starts here
+  EXPECT_EQ(first.package->pkgFreq(), 2500u);
+  EXPECT_EQ(first.package->pkgFreqNominal(), 2400u);
+  EXPECT_EQ(first.package->qosBgTime(), 50 * 1000 / ticksPerSecond() / 2);
+  EXPECT_EQ(first.package->qosIdleTime(), 1000 * 1000 / ticksPerSecond() / 2);
+  ASSERT_EQ(first.cstates.size(), 3u);  // package, cpu0, cpu1
+  EXPECT_EQ(first.cstates[0].core(), -1);
+  EXPECT_FALSE(first.cstates[0].isCore());
+  EXPECT_TRUE(first.cstates[2].isCore());
+  EXPECT_EQ(first.cstates[2].core(), 1);
+  ASSERT_EQ(first.cstates[1].statesCount(), 3u);
+  EXPECT_EQ(first.cstates[1].statesAtIndex(2).residency(), 2000u);  // µs to ms
+
+  // cpu0 idles 300 ms in C1 and 500 in C2, cpu1 200 and 700: the package
+  // counts only what both did; the energy counter wrapped at 1 J.
+  writeCpus(tree, 1'300'000, 2'500'000, 1'200'000, 2'700'000, 400'000);
+  const auto second = cpu.read(2000);
+  ASSERT_TRUE(second.package);
+  EXPECT_EQ(second.package->energyModelMillijoules(), 900u + 500u);
+  EXPECT_EQ(second.package->pkgCanyResidency(), 800u);
+  EXPECT_EQ(second.package->pkgCmaxResidency(), 500u);
+  const Cstates& pkg = second.cstates[0];
+  ASSERT_EQ(pkg.statesCount(), 2u);
+  EXPECT_EQ(pkg.statesAtIndex(0).level(), 1u);
+  EXPECT_EQ(pkg.statesAtIndex(0).residency(), 200u);
+  EXPECT_EQ(pkg.statesAtIndex(1).level(), 2u);
+  EXPECT_EQ(pkg.statesAtIndex(1).residency(), 500u);
+}
+
+TEST(RecorderSources, PackageMsrsWinOverTheCpuidleApproximation) {
+  MachineTree tree;
+  writeCpus(tree, 0, 0, 0, 0, 0);
+  tree.put("/dev/cpu/0/msr", "");
+  const int fd = ::open((tree.dir / "dev/cpu/0/msr").c_str(), O_WRONLY);
+  ASSERT_GE(fd, 0);
+  // In a plain file neighbouring MSR numbers overlap; C2 has no neighbours.
+  const std::uint64_t c2 = 2400ull * 1000 * 1500;  // 1.5 s at 2.4 GHz
+  ASSERT_EQ(::pwrite(fd, &c2, 8, 0x60D), 8);
+  const std::uint64_t zero = 0;
+  ASSERT_EQ(::pwrite(fd, &zero, 8, 0x632), 8);
+  ::close(fd);
+  recorder::MachineFiles machine(tree.dir.path());
+  recorder::CpuSource cpu(machine);
+  const auto sample = cpu.read(1000);
+  ASSERT_TRUE(sample.package);
+  EXPECT_EQ(sample.package->pkgCanyResidency(), 1500u);
+  EXPECT_EQ(sample.package->pkgCmaxResidency(), 1500u);
+  ASSERT_EQ(sample.cstates.size(), 3u);  // the MSRs' package record, then both CPUs from cpuidle
+  EXPECT_EQ(sample.cstates[0].core(), -1);
+  ASSERT_EQ(sample.cstates[0].statesCount(), 7u);
+  EXPECT_EQ(sample.cstates[0].statesAtIndex(0).level(), 2u);
+  EXPECT_EQ(sample.cstates[0].statesAtIndex(0).residency(), 1500u);
+  EXPECT_EQ(sample.cstates[0].statesAtIndex(2).residency(), 0u);
+  EXPECT_TRUE(sample.cstates[1].isCore());
+}
+
+TEST(RecorderSources, CountersOfWholeDisksNetworksInterruptsAndMemory) {
+  Rig rig;
+  rig.tree.put("/proc/diskstats",
+               "   8       0 sda 100 0 2000 50 200 0 4000 60 0 0 0\n"
+               "   8       1 sda1 90 0 1800 40 190 0 3800 50 0 0 0\n"
+               "   7       0 loop0 5 0 10 1 0 0 0 0 0 0 0\n"
+               " 259       0 nvme0n1 10 0 100 5 20 0 300 6 0 0 0\n"
+               " 259       1 nvme0n1p1 10 0 100 5 20 0 300 6 0 0 0\n");
+  rig.tree.put("/sys/block/sda/device/model", "disk\n");
+  rig.tree.put("/sys/block/nvme0n1/device/model", "ssd\n");
+  rig.tree.put("/sys/block/loop0/size", "0\n");
+  rig.tree.put("/proc/net/dev",
+               "Inter-|   Receive |  Transmit\n face |bytes packets errs drop fifo frame compressed multicast|...\n"
+               "    lo: 5000 50 0 0 0 0 0 0 5000 50 0 0 0 0 0 0\n"
+               "  eth0: 1000 10 0 0 0 0 0 0 2000 20 0 0 0 0 0 0\n"
+               " wlan0: 300 3 0 0 0 0 0 0 400 4 0 0 0 0 0 0\n");
+  rig.tree.put("/proc/interrupts",
+               "           CPU0       CPU1\n  0:         12          0   IO-APIC   2-edge      timer\n"
+               "LOC:        500        700   Local timer interrupts\nERR:          0\n");
+  rig.tree.put("/proc/meminfo",
+               "MemTotal:       8000000 kB\nMemFree:        400000 kB\nActive(anon):   100000 kB\n"
+               "Inactive(anon):  20000 kB\nActive(file):   300000 kB\nInactive(file): 100000 kB\n"
+               "Unevictable:       4000 kB\nKernelStack:       8000 kB\nPageTables:       12000 kB\n"
+               "SUnreclaim:       16000 kB\n");
+  rig.tree.put("/proc/vmstat", "pgpgin 8000\npgpgout 4000\npswpin 3\npswpout 5\npgfault 123456\n");
+  rig.tree.put("/proc/swaps", "Filename Type Size Used Priority\n/dev/nvme0n1p2 partition 100 0 -2\n");
+  rig.tree.put("/sys/block/nvme0n1/queue/rotational", "0\n");
+  rig.recorder.tick();
+
+  const auto store = rig.contents();
+  const auto io = store.all<SystemIO>();
+  ASSERT_EQ(io.size(), 1u);
+  EXPECT_EQ(io[0]->diskReadOps(), 110u);
+  EXPECT_EQ(io[0]->diskWriteOps(), 220u);
+  EXPECT_EQ(io[0]->diskBytesRead(), 2100u * 512);
+  EXPECT_EQ(io[0]->diskBytesWritten(), 4300u * 512);
+  EXPECT_EQ(io[0]->networkBytesIn(), 1300u);
+  EXPECT_EQ(io[0]->networkPacketsIn(), 13u);
+  EXPECT_EQ(io[0]->networkBytesOut(), 2400u);
+  EXPECT_EQ(io[0]->networkPacketsOut(), 24u);
+
+  const auto interrupts = store.all<Interrupts>();
+  ASSERT_EQ(interrupts.size(), 1u);
+  ASSERT_EQ(interrupts[0]->vectorsCount(), 3u);  // zero counts left out
+  EXPECT_EQ(interrupts[0]->vectorsAtIndex(0).vectorName(), "0");
+  EXPECT_EQ(interrupts[0]->vectorsAtIndex(2).cpuNumber(), 1u);
+  EXPECT_EQ(interrupts[0]->vectorsAtIndex(2).interruptCount(), 700u);
+
+  const auto memory = store.all<SystemMemory>();
+  ASSERT_EQ(memory.size(), 1u);
+  const std::uint64_t page = static_cast<std::uint64_t>(sysconf(_SC_PAGESIZE));
+  EXPECT_EQ(memory[0]->memorySize(), 8000000ull * 1024);
+  EXPECT_EQ(memory[0]->pageSize(), page);
+  EXPECT_EQ(memory[0]->freeCount(), 400000u * 1024 / page);
+  EXPECT_EQ(memory[0]->wiredCount(), 40000u * 1024 / page);
+  EXPECT_EQ(memory[0]->internalPageCount(), 120000u * 1024 / page);
+  EXPECT_EQ(memory[0]->pageins(), 8000u / (page / 1024));
+  EXPECT_EQ(memory[0]->swapouts(), 5u);
+  EXPECT_EQ(memory[0]->faults(), 123456u);
+  EXPECT_TRUE(memory[0]->hasSwapDeviceIsSsd());
+  EXPECT_TRUE(memory[0]->swapDeviceIsSsd());
+}
+
+TEST(RecorderSources, AbsentSourcesWriteNothing) {
+  Rig rig;
+  rig.recorder.begin();
+  rig.recorder.tick();
+  const auto store = rig.contents();
+  ASSERT_EQ(store.records.size(), 2u);  // the header and its TimeChange
+  EXPECT_NE(recordCast<LogStartsV1>(store.records[0]), nullptr);
+}
+
+}  // namespace
+}  // namespace bw::test
