@@ -5,9 +5,11 @@
 #include "base/Console.h"
 #include "base/Exception.h"
 #include "cli/ModelLoader.h"
+#include "cli/ModelRunner.h"
 #include "cli/OptionParser.h"
 #include "cli/Options.h"
 #include "cli/RecordModes.h"
+#include "reports/Dashboard.h"
 
 namespace bw {
 
@@ -24,12 +26,23 @@ void listFiles(const Options& options) {
   }
 }
 
+void runDashboard(const Options& options) {
+  const DashboardSettings settings{options.show_all(), options.includingSubjobs()};
+  runPerModel(options, [&](const Model& model, const std::vector<Range>& ranges) {
+    printDashboard(out(), settings, model, ranges);
+  });
+}
+
 [[noreturn]] void notAvailableYet() { exitWithMessage(69, "this mode is not available yet"); }
 
 }  // namespace
 
 void dispatch(const Options& options) {
   switch (options.mode()) {
+    case kModeNone:
+    case kModeDashboard:
+      runDashboard(options);
+      break;
     case kModeListFiles:
       listFiles(options);
       break;
