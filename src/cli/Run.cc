@@ -6,10 +6,12 @@
 #include "base/Exception.h"
 #include "base/Terminal.h"
 #include "cli/ModelLoader.h"
+#include "cli/ModelRunner.h"
 #include "cli/OptionParser.h"
 #include "cli/Options.h"
 #include "cli/RecordModes.h"
 #include "cli/StoreWatch.h"
+#include "reports/Dashboard.h"
 
 namespace bw {
 
@@ -27,12 +29,23 @@ void listFiles(const Options& options) {
   }
 }
 
+void runDashboard(const Options& options) {
+  const DashboardSettings settings{options.show_all(), options.includingSubjobs()};
+  runPerModel(options, [&](const Model& model, const std::vector<Range>& ranges) {
+    printDashboard(out(), settings, model, ranges);
+  });
+}
+
 [[noreturn]] void notAvailableYet() { exitWithMessage(69, "this mode is not available yet"); }
 
 }  // namespace
 
 void dispatch(const Options& options) {
   switch (options.mode()) {
+    case kModeNone:
+    case kModeDashboard:
+      runDashboard(options);
+      break;
     case kModeListFiles:
       listFiles(options);
       break;
