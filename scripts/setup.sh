@@ -8,6 +8,7 @@ packages=(
   libprotobuf-dev protobuf-compiler
   libicu-dev
   libplist-dev
+  libsystemd-dev systemd
   libgtest-dev libgmock-dev googletest
   libbenchmark-dev
   clang libclang-rt-14-dev

@@ -4,10 +4,13 @@
 
 #include "base/Console.h"
 #include "base/Exception.h"
+#include "cli/DailyRun.h"
 #include "cli/ModelLoader.h"
 #include "cli/OptionParser.h"
 #include "cli/Options.h"
 #include "cli/RecordModes.h"
+#include "reports/JournalDailyReports.h"
+#include "reports/JournalSink.h"
 
 namespace bw {
 
@@ -42,6 +45,12 @@ void dispatch(const Options& options) {
     case kModeShowBattery:
       runBatteryPlot(options);
       break;
+    case kModeDaily: {
+      JournalSink journal;
+      JournalDailyReports reports(journal);
+      runDaily(options, reports);
+      break;
+    }
     default:
       notAvailableYet();
   }
