@@ -14,6 +14,7 @@
 #include "reports/DailyReports.h"
 #include "store/PropertyListReader.h"
 #include "support/FakePlatform.h"
+#include "support/TempDir.h"
 
 namespace bw {
 namespace {
@@ -45,6 +46,11 @@ struct RecordingReports : DailyReports {
   }
   std::vector<std::string> calls;
 };
+
+// The trace line of a span given in wall-clock milliseconds.
+std::string trace(const std::string& signature, std::uint64_t startMs, std::uint64_t endMs) {
+  return "trace " + signature + " " + std::to_string(startMs / 1000) + " " + std::to_string(endMs / 1000) + " 0";
+}
 
 Date at(std::uint64_t wallMs) { return Date::fromMilliseconds(static_cast<double>(wallMs)); }
 
@@ -113,18 +119,19 @@ TEST(DailyDates, APostInstallSpanIsCutToOneHourOnlyBeyondIt) {
   EXPECT_EQ(firstHourOf({}), std::vector<Range>{});
 }
 
+// The records come hourly and carry no wall time, so a day's range runs
+// from its first record to the first record after its end (25 hours), and
+// from the zone record, 500 ms into the boot, on the first day.
 TEST_F(DailyRun, LastReportThreeDaysAgoReportsTwoDaysInOrderAndSavesTheLater) {
   test::writeBoot(store / "a.stats", test::kBootA, "B2", kJan1, 80);
   writeState({{"LastReportDate", Value(at(kJan1))}, {"LastReportBuild", "B2"}, {"Other", "kept"}});
   now(kJan1 + 3 * kDay + 10 * kHour);
-  const std::vector<std::string> trace2 = {
-      format("trace com.vexil.Brindlewick.Daily %llu %llu 0", (kJan1 + kDay) / 1000, (kJan1 + 2 * kDay) / 1000)};
-  EXPECT_EQ(run(), (std::vector<std::string>{"telemetry B2 daily 20240102 86400000", "standby B2 daily 20240102",
-                                             trace2[0], "power B2 3", "fan B2 3",
-                                             "telemetry B2 daily 20240103 86400000", "standby B2 daily 20240103",
-                                             format("trace com.vexil.Brindlewick.Daily %llu %llu 0",
-                                                    (kJan1 + 2 * kDay) / 1000, (kJan1 + 3 * kDay) / 1000),
-                                             "power B2 3", "fan B2 3"}));
+  const std::vector<std::string> trace2 = {trace("com.vexil.Brindlewick.Daily", kJan1 + kDay, kJan1 + 2 * kDay)};
+  EXPECT_EQ(run(),
+            (std::vector<std::string>{
+                "telemetry B2 daily 20240102 90000000", "standby B2 daily 20240102", trace2[0], "power B2 3",
+                "fan B2 3", "telemetry B2 daily 20240103 90000000", "standby B2 daily 20240103",
+                trace("com.vexil.Brindlewick.Daily", kJan1 + 2 * kDay, kJan1 + 3 * kDay), "power B2 3", "fan B2 3"}));
   const Dictionary saved = state();
   EXPECT_EQ(saved.at("LastReportDate"), Value(at(kJan1 + 2 * kDay)));
   EXPECT_EQ(saved.at("LastReportBuild"), Value("B2"));
@@ -142,14 +149,19 @@ TEST_F(DailyRun, LastReportYesterdayReportsNothingAndLeavesTheStateFileAlone) {
   std::ifstream before(stateFilePath());
   const std::string bytes((std::istreambuf_iterator<char>(before)), {});
   now(kJan1 + 3 * kDay + 10 * kHour);
+  EXPECT_EQ(run(), std::vector<std::string>{});
+  std::ifstream after(stateFilePath());
+  EXPECT_EQ(std::string((std::istreambuf_iterator<char>(after)), {}), bytes);
+  EXPECT_FALSE(std::filesystem::exists(usageFilePath()));
+
+  // A debug run reports today as well: nothing left only once today is.
+  writeState({{"LastReportDate", Value(at(kJan1 + 3 * kDay))}});
   std::ostringstream o, e;
   setConsole(&o, &e);
   gDebug = 1;
   EXPECT_EQ(run(), std::vector<std::string>{});
   setConsole(nullptr, nullptr);
   EXPECT_NE(e.str().find("No dates to report - all done with daily report.\n"), std::string::npos) << e.str();
-  std::ifstream after(stateFilePath());
-  EXPECT_EQ(std::string((std::istreambuf_iterator<char>(after)), {}), bytes);
 }
 
 TEST_F(DailyRun, ABuildChangeReportsThePostInstallHourAndOlderBuildsGetNoTopEvents) {
@@ -162,17 +174,16 @@ TEST_F(DailyRun, ABuildChangeReportsThePostInstallHourAndOlderBuildsGetNoTopEven
 
   std::vector<std::string> a1, b2;
   for (const std::string& c : calls) (c.find(" A1 ") != std::string::npos ? a1 : b2).push_back(c);
-  EXPECT_EQ(a1, (std::vector<std::string>{"telemetry A1 daily 20240101 86400000", "standby A1 daily 20240101",
+  EXPECT_EQ(a1, (std::vector<std::string>{"telemetry A1 daily 20240101 89999500", "standby A1 daily 20240101",
                                           "telemetry A1 daily 20240102 7200000", "standby A1 daily 20240102"}));
   ASSERT_GE(b2.size(), 2u);
   EXPECT_EQ(b2[0], "telemetry B2 postinstall - 3600000");
   const std::uint64_t bootStart = kJan1 + kDay + 12 * kHour;
-  EXPECT_EQ(b2[1], format("trace com.vexil.Brindlewick.PostInstall %llu %llu 0", bootStart / 1000,
-                          (bootStart + kHour) / 1000));
-  // The day loses the post-install hour; the top events follow each day.
-  EXPECT_EQ(b2[2], "telemetry B2 daily 20240102 39600000");
-  EXPECT_EQ(b2[4],
-            format("trace com.vexil.Brindlewick.Daily %llu %llu 0", bootStart / 1000, (kJan1 + 2 * kDay) / 1000));
+  EXPECT_EQ(b2[1], trace("com.vexil.Brindlewick.PostInstall", bootStart, bootStart + kHour));
+  // The day (00:00:00.5 to 13:00 into the boot) loses the post-install
+  // hour; the top events follow each day.
+  EXPECT_EQ(b2[2], "telemetry B2 daily 20240102 43200000");
+  EXPECT_EQ(b2[4], trace("com.vexil.Brindlewick.Daily", bootStart, kJan1 + 2 * kDay));
   EXPECT_EQ(state().at("LastReportBuild"), Value("B2"));
 }
 

@@ -12,6 +12,7 @@
 #include "store/AtomicFile.h"
 #include "store/PropertyListReader.h"
 #include "support/FakePlatform.h"
+#include "support/TempDir.h"
 
 namespace bw {
 namespace {

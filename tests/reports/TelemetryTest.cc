@@ -1,5 +1,6 @@
 #include <gtest/gtest.h>
 
+#include <cmath>
 #include <filesystem>
 #include <sstream>
 
@@ -14,7 +15,9 @@
 #include "cli/ReportState.h"
 #include "reports/JournalDailyReports.h"
 #include "reports/JournalSink.h"
+#include "reports/Telemetry.h"
 #include "support/FakePlatform.h"
+#include "support/TempDir.h"
 
 namespace bw {
 namespace {
@@ -154,9 +157,9 @@ TEST_F(Telemetry, ADayWithBatteryACSleepAndDarkWakeSendsTheSixMessagesThenStandb
   }
 
   const TelemetryMessage& battery = messages[0];
-  // Two hours on battery, awake: 400 mAh given, whole-second durations.
+  // On battery and awake from 00:00:01 to 03:00: 400 mAh given.
   EXPECT_EQ(battery.value(kKey + "battery-wake.delta_charge"), "400");
-  EXPECT_EQ(battery.value(kKey + "battery-wake.delta_charge.duration"), "7199");
+  EXPECT_EQ(battery.value(kKey + "battery-wake.delta_charge.duration"), "10799");
   EXPECT_TRUE(battery.value(kKey + "battery-wake.avg_power"));
   EXPECT_EQ(battery.value(kKey + "battery-idle.delta_charge.duration"), "3600");
   EXPECT_TRUE(battery.value(kKey + "ac-wake.delta_charge.duration"));
