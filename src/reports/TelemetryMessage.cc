@@ -11,6 +11,14 @@ void TelemetryMessage::setField(const std::string& prefix, const std::string& na
   if (key.size() > kMaxKey) key.resize(kMaxKey);
   std::string text = value.size() > kMaxValue ? value.substr(0, kMaxValue) : value;
   if (gDebug) err() << key << ": " << text << "\n";
+  // Setting a key again replaces its value in place (a device type that is
+  // also a state, such as Wi-Fi, is set twice).
+  for (auto& [k, v] : fields_) {
+    if (k == key) {
+      v = std::move(text);
+      return;
+    }
+  }
   fields_.emplace_back(std::move(key), std::move(text));
 }
 

@@ -19,7 +19,8 @@ class TelemetryMessage {
 
   explicit TelemetryMessage(std::string domain) : domain_(std::move(domain)) {}
 
-  // `prefix` may be empty (no group).
+  // `prefix` may be empty (no group). A key set again keeps its place and
+  // takes the new value.
   void setField(const std::string& prefix, const std::string& name, const std::string& value);
   // round(value) as "%lld"; nothing for NaN or an infinity.
   void setNumber(const std::string& prefix, const std::string& name, double value);

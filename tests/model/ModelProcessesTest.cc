@@ -73,7 +73,9 @@ TEST_F(ModelProcesses, UsageCountsEveryProcessOnceUnderTheJobThatRunsIt) {
   for (const JobUsage& job : usage->jobs) {
     jobSeconds += job.cpuSeconds;
     EXPECT_DOUBLE_EQ(job.powerScore, job.cpuSeconds * 1e9) << job.label;  // no idle wake-ups
-    if (job.label == "App") EXPECT_DOUBLE_EQ(job.cpuSeconds, 0.030);
+    if (job.label == "App") {
+      EXPECT_DOUBLE_EQ(job.cpuSeconds, 0.030);
+    }
   }
   EXPECT_DOUBLE_EQ(jobSeconds, 0.035);
   EXPECT_EQ(ModelUsageInputs(*model).build(), "23A344");

@@ -185,6 +185,18 @@ TEST_F(Telemetry, ADayWithBatteryACSleepAndDarkWakeSendsTheSixMessagesThenStandb
   EXPECT_EQ(details.value(kKey + "wake_type"), "UserActivity");
   EXPECT_EQ(details.value(kKey + "image_read_mb_s"), "205");  // 409.6 MB in 2 s
   EXPECT_EQ(messages[6].value(kKey + "wakes"), "1");
+
+  // The day's trace names its span; the power events follow, ranked.
+  EXPECT_EQ(messages[8].value(kKey + "signature"), "com.vexil.Brindlewick.Daily");
+  EXPECT_EQ(messages[8].value(kKey + "start"), std::to_string(kJan1 / 1000));
+  EXPECT_EQ(messages[8].value(kKey + "end"), std::to_string(kJan1 / 1000 + 86400));
+  ASSERT_GE(messages.size(), 10u);
+  for (std::size_t i = 9; i < messages.size(); ++i) {
+    EXPECT_EQ(messages[i].domain(), "com.vexil.brindlewick.top-power-event");
+    EXPECT_EQ(messages[i].value(kKey + "rank"), std::to_string(i - 8));
+    EXPECT_TRUE(messages[i].value(kKey + "avg_power"));
+  }
+  EXPECT_LE(messages.size(), 12u);
 }
 
 TEST_F(Telemetry, ADesktopStillSendsTheACAndWakeGroups) {
@@ -206,10 +218,11 @@ TEST(TelemetryFields, KeysAndValuesAreCutAndNumbersRounded) {
   m.setNumber("", "half", 2.5);
   m.setNumber("", "negative", -0.4);
   m.setNumber("", "nan", std::nan(""));
+  m.setNumber("", "half", 7);  // set again: replaced in place
   ASSERT_EQ(m.fields().size(), 3u);
   EXPECT_EQ(m.fields()[0].first, (kKey + std::string(40, 'p') + ".name").substr(0, 63));
   EXPECT_EQ(m.fields()[0].second, std::string(127, 'v'));
-  EXPECT_EQ(m.fields()[1].second, "3");
+  EXPECT_EQ(m.fields()[1].second, "7");
   EXPECT_EQ(m.fields()[2].second, "0");
 }
 
