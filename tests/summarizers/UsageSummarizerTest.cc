@@ -47,10 +47,11 @@ class Usage : public ::testing::Test {
 
 TEST_F(Usage, DayHoldsWholeSecondsOfEachStateAndTheBatteryDrain) {
   const Dictionary usage = UsageSummarizer::usageOfDay(day, ModelUsageInputs(model));
-  const Dictionary expected{{"Wake", Value(7200)},    {"Sleep", Value(3600)},       {"DarkWake", Value(0)},
-                            {"Standby", Value(1800)}, {"UserActive", Value(3600)},  {"OnBattery", Value(3600)},
-                            {"OnAC", Value(82800)},   {"BatteryDrain", Value(1000)}};
-  EXPECT_EQ(usage, expected);  // no "Processes" summarizer: no CPU time, no jobs
+  const Dictionary expected{{"Wake", Value(7200)},      {"Sleep", Value(3600)},        {"DarkWake", Value(0)},
+                            {"Standby", Value(1800)},   {"UserActive", Value(3600)},   {"OnBattery", Value(3600)},
+                            {"OnAC", Value(82800)},     {"BatteryDrain", Value(1000)}, {"CPUTime", Value(0.0)},
+                            {"TopJobs", Value(Array{})}};
+  EXPECT_EQ(usage, expected);  // process accounting without process records
 }
 
 // The model's answers with process figures given by the test.
@@ -107,7 +108,8 @@ TEST_F(Usage, FileRoundTripsThroughAnXmlPropertyListDroppingOldDaysAndKeepingUnk
 
 // The same figures reported as another build.
 struct AsBuild : WithProcesses {
-  AsBuild(const Model& model, ProcessFigures p, std::string b) : WithProcesses(model, std::move(p)), name(std::move(b)) {}
+  AsBuild(const Model& model, ProcessFigures p, std::string b)
+      : WithProcesses(model, std::move(p)), name(std::move(b)) {}
   std::optional<std::string> build() const override { return name; }
   std::string name;
 };
