@@ -5,6 +5,7 @@
 #include "base/Console.h"
 #include "base/Exception.h"
 #include "base/Terminal.h"
+#include "cli/DailyRun.h"
 #include "cli/ModelLoader.h"
 #include "cli/ModelRunner.h"
 #include "cli/OptionParser.h"
@@ -12,6 +13,8 @@
 #include "cli/RecordModes.h"
 #include "cli/StoreWatch.h"
 #include "reports/Dashboard.h"
+#include "reports/JournalDailyReports.h"
+#include "reports/JournalSink.h"
 
 namespace bw {
 
@@ -58,6 +61,12 @@ void dispatch(const Options& options) {
     case kModeShowBattery:
       runBatteryPlot(options);
       break;
+    case kModeDaily: {
+      JournalSink journal;
+      JournalDailyReports reports(journal);
+      runDaily(options, reports);
+      break;
+    }
     default:
       notAvailableYet();
   }
