@@ -7,5 +7,5 @@ BUILD_DIR=${BUILD_DIR:-build}
 bin="$BUILD_DIR"/src/brindlewick
 # Three days of a simulated laptop, generated once.
 [[ -d sample-store ]] || "$BUILD_DIR"/tools/samplestore/brindlewick-samplestore --days 3 --output sample-store
-# The event listing; until it exists (status 69), the list of stats files.
-"$bin" --from ./sample-store --show-events || { s=$?; ((s == 69)) || exit $s; "$bin" --from ./sample-store --list-files; }
+# The dashboard over all of it.
+"$bin" --from ./sample-store

@@ -8,7 +8,7 @@ packages=(
   libprotobuf-dev protobuf-compiler
   libicu-dev
   libplist-dev
-  libsystemd-dev dbus
+  libsystemd-dev dbus systemd
   libgtest-dev libgmock-dev googletest
   libbenchmark-dev
   clang libclang-rt-14-dev

@@ -5,11 +5,16 @@
 #include "base/Console.h"
 #include "base/Exception.h"
 #include "base/Terminal.h"
+#include "cli/DailyRun.h"
 #include "cli/ModelLoader.h"
+#include "cli/ModelRunner.h"
 #include "cli/OptionParser.h"
 #include "cli/Options.h"
 #include "cli/RecordModes.h"
 #include "cli/StoreWatch.h"
+#include "reports/Dashboard.h"
+#include "reports/JournalDailyReports.h"
+#include "reports/JournalSink.h"
 #include "service/AnalysisService.h"
 
 namespace bw {
@@ -28,12 +33,23 @@ void listFiles(const Options& options) {
   }
 }
 
+void runDashboard(const Options& options) {
+  const DashboardSettings settings{options.show_all(), options.includingSubjobs()};
+  runPerModel(options, [&](const Model& model, const std::vector<Range>& ranges) {
+    printDashboard(out(), settings, model, ranges);
+  });
+}
+
 [[noreturn]] void notAvailableYet() { exitWithMessage(69, "this mode is not available yet"); }
 
 }  // namespace
 
 void dispatch(const Options& options) {
   switch (options.mode()) {
+    case kModeNone:
+    case kModeDashboard:
+      runDashboard(options);
+      break;
     case kModeListFiles:
       listFiles(options);
       break;
@@ -52,6 +68,12 @@ void dispatch(const Options& options) {
     case kModeServiceDebug:
       runServiceDebug(storeQuery(options));
       break;
+    case kModeDaily: {
+      JournalSink journal;
+      JournalDailyReports reports(journal);
+      runDaily(options, reports);
+      break;
+    }
     default:
       notAvailableYet();
   }

@@ -2,6 +2,8 @@
 
 #include "model/Model.h"
 #include "summarizers/PowerSummary.h"
+#include "summarizers/ProcessSummarizer.h"
+#include "summarizers/ProcessSummary.h"
 
 namespace bw {
 namespace {
@@ -32,10 +34,21 @@ std::uint64_t ModelUsageInputs::wallTimeForRelative(std::uint64_t position) cons
   return model_.wallTimeForRelative(position);
 }
 
-// Process accounting is not part of the model yet: without it there are no
-// CPU seconds or job power scores, and the usage file leaves "CPUTime" and
-// "TopJobs" out rather than writing zeros.
-std::optional<ProcessUsage> ModelUsageInputs::processUsage(const std::vector<Range>&) const { return std::nullopt; }
+// The root summary without subjobs counts every process once; each job
+// reports its own processes' CPU time and power score.
+std::optional<ProcessFigures> ModelUsageInputs::processUsage(const std::vector<Range>& ranges) const {
+  if (!model_.processes()) return std::nullopt;
+  const std::unique_ptr<ProcessSummary> root = model_.summarizeProcessesIncludingSubjobs(false, ranges);
+  ProcessFigures usage;
+  usage.cpuSeconds = root->cpuTime() / 1e9;
+  for (const auto& [key, job] : root->subprocesses()) {
+    const std::string* label = job->label();
+    usage.jobs.push_back(JobUsage{label ? *label : key, job->cpuTime() / 1e9, job->powerScore()});
+  }
+  return usage;
+}
+
+std::optional<std::string> ModelUsageInputs::build() const { return model_.systemVersion(); }
 
 void summarizeUsage(Dictionary& usage, const std::vector<Range>& ranges, const Model& model) {
   usageSummarizer(model).summarizeUsage(usage, ranges, ModelUsageInputs(model));

@@ -4,6 +4,7 @@
 // and summarizeUsage updates the usage file's dictionary through the
 // model's "Usage" summarizer.
 #include <optional>
+#include <string>
 #include <vector>
 
 #include "base/Value.h"
@@ -23,8 +24,11 @@ class ModelUsageInputs : public UsageInputs {
   // The "Power" summary's deltaCharge.
   std::optional<double> chargeChange(const std::vector<Range>& ranges) const override;
   std::uint64_t wallTimeForRelative(std::uint64_t position) const override;
-  // None: the model has no process accounting yet.
-  std::optional<ProcessUsage> processUsage(const std::vector<Range>& ranges) const override;
+  // The root process summary's CPU seconds and each job's label, CPU
+  // seconds and power score; none without a "Processes" summarizer.
+  std::optional<ProcessFigures> processUsage(const std::vector<Range>& ranges) const override;
+  // The model's system version.
+  std::optional<std::string> build() const override;
 
  protected:
   const Model& model_;

@@ -4,6 +4,7 @@
 #include <chrono>
 #include <cmath>
 #include <cstdio>
+#include <map>
 
 #include "base/Console.h"
 
@@ -34,7 +35,54 @@ std::optional<std::chrono::sys_days> dayOfKey(const std::string& key) {
   return std::chrono::sys_days{ymd};
 }
 
+// The five highest power scores, ties by label.
+Value topJobs(std::vector<JobUsage> jobs) {
+  std::stable_sort(jobs.begin(), jobs.end(), [](const JobUsage& a, const JobUsage& b) {
+    return a.powerScore != b.powerScore ? a.powerScore > b.powerScore : a.label < b.label;
+  });
+  if (jobs.size() > UsageSummarizer::kTopJobs) jobs.resize(UsageSummarizer::kTopJobs);
+  Array top;
+  for (const JobUsage& job : jobs) {
+    top.push_back(Value(Dictionary{
+        {"Label", Value(job.label)}, {"CPUTime", Value(job.cpuSeconds)}, {"PowerScore", Value(job.powerScore)}}));
+  }
+  return Value(std::move(top));
+}
+
 }  // namespace
+
+Dictionary UsageSummarizer::combineBuilds(const Dictionary& builds) {
+  Dictionary sum;
+  std::map<std::string, JobUsage> jobs;
+  bool anyJobs = false;
+  for (const auto& [build, figures] : builds) {
+    if (!figures.is<Dictionary>()) continue;
+    for (const auto& [key, value] : figures.get<Dictionary>()) {
+      if (key == "TopJobs" && value.is<Array>()) {
+        anyJobs = true;
+        for (const Value& job : value.get<Array>()) {
+          const Dictionary* j = job.getIf<Dictionary>();
+          const std::string* label = j && j->count("Label") ? j->at("Label").getIf<std::string>() : nullptr;
+          if (!label) continue;
+          JobUsage& total = jobs[*label];
+          total.label = *label;
+          total.cpuSeconds += j->count("CPUTime") ? j->at("CPUTime").doubleValue() : 0;
+          total.powerScore += j->count("PowerScore") ? j->at("PowerScore").doubleValue() : 0;
+        }
+      } else if (value.is<double>()) {
+        sum[key] = Value((sum.count(key) ? sum[key].doubleValue() : 0.0) + value.get<double>());
+      } else if (value.isNumber() && !value.is<bool>()) {
+        sum[key] = Value(static_cast<long long>((sum.count(key) ? sum[key].int64Value() : 0) + value.int64Value()));
+      }
+    }
+  }
+  if (anyJobs) {
+    std::vector<JobUsage> list;
+    for (auto& [label, job] : jobs) list.push_back(job);
+    sum["TopJobs"] = topJobs(std::move(list));
+  }
+  return sum;
+}
 
 std::string UsageSummarizer::dayKey(const YearMonthDay& day) {
   return format("%04d-%02d-%02d", day.year, day.month, day.day);
@@ -58,19 +106,9 @@ Dictionary UsageSummarizer::usageOfDay(const std::vector<Range>& ranges, const U
     if (delta) day["BatteryDrain"] = Value(static_cast<long long>(std::llround(*delta < 0 ? -*delta : 0.0)));
   }
 
-  if (const std::optional<ProcessUsage> processes = model.processUsage(ranges)) {
+  if (const std::optional<ProcessFigures> processes = model.processUsage(ranges)) {
     day["CPUTime"] = Value(processes->cpuSeconds);
-    std::vector<JobUsage> jobs = processes->jobs;
-    std::stable_sort(jobs.begin(), jobs.end(), [](const JobUsage& a, const JobUsage& b) {
-      return a.powerScore != b.powerScore ? a.powerScore > b.powerScore : a.label < b.label;
-    });
-    if (jobs.size() > kTopJobs) jobs.resize(kTopJobs);
-    Array top;
-    for (const JobUsage& job : jobs) {
-      top.push_back(Value(Dictionary{
-          {"Label", Value(job.label)}, {"CPUTime", Value(job.cpuSeconds)}, {"PowerScore", Value(job.powerScore)}}));
-    }
-    day["TopJobs"] = Value(std::move(top));
+    day["TopJobs"] = topJobs(processes->jobs);
   }
   return day;
 }
@@ -89,7 +127,15 @@ void UsageSummarizer::summarizeUsage(Dictionary& usage, const YearMonthDay& day,
                                      const UsageInputs& model) const {
   Value& entry = usage[dayKey(day)];
   if (!entry.is<Dictionary>()) entry = Value(Dictionary{});
-  for (auto& [key, value] : usageOfDay(ranges, model)) entry.get<Dictionary>()[key] = std::move(value);
+  Dictionary& dayEntry = entry.get<Dictionary>();
+  Dictionary figures = usageOfDay(ranges, model);
+  if (const std::optional<std::string> build = model.build()) {
+    Value& builds = dayEntry["Builds"];
+    if (!builds.is<Dictionary>()) builds = Value(Dictionary{});
+    builds.get<Dictionary>()[*build] = Value(std::move(figures));
+    figures = combineBuilds(builds.get<Dictionary>());
+  }
+  for (auto& [key, value] : figures) dayEntry[key] = std::move(value);
   dropOldDays(usage);
 }
 

@@ -13,7 +13,10 @@
 //
 // Updating replaces the day's own keys (other keys of that day and the
 // file's keys that are not days are kept), then drops every day more than
-// 35 days older than the newest day in the file.
+// 35 days older than the newest day in the file. When the build is known,
+// the day also keeps each build's own figures under "Builds" (a system
+// update splits a day between two builds) and its figures are the sum over
+// its builds: reporting one build's day again replaces that build's part.
 #include <cstdint>
 #include <functional>
 #include <optional>
@@ -33,8 +36,9 @@ struct JobUsage {
   double powerScore = 0;
 };
 
-// The day's process figures: total CPU seconds and every job.
-struct ProcessUsage {
+// The day's process figures: total CPU seconds and every job (named apart
+// from the ProcessUsage record).
+struct ProcessFigures {
   double cpuSeconds = 0;
   std::vector<JobUsage> jobs;
 };
@@ -53,7 +57,9 @@ class UsageInputs {
   // The wall time (ms since 1970) at a position; 0 when unknown.
   virtual std::uint64_t wallTimeForRelative(std::uint64_t position) const = 0;
   // The process figures over `ranges`; none without process accounting.
-  virtual std::optional<ProcessUsage> processUsage(const std::vector<Range>& ranges) const = 0;
+  virtual std::optional<ProcessFigures> processUsage(const std::vector<Range>& ranges) const = 0;
+  // The build the figures belong to; none when unknown.
+  virtual std::optional<std::string> build() const { return std::nullopt; }
 };
 
 class UsageSummarizer : public Summarizer {
@@ -78,6 +84,9 @@ class UsageSummarizer : public Summarizer {
 
   // "YYYY-MM-DD".
   static std::string dayKey(const YearMonthDay& day);
+  // The sum of several builds' figures of one day: counts and CPU time add
+  // up; top jobs of one label add up and the five highest remain.
+  static Dictionary combineBuilds(const Dictionary& builds);
   // Removes the day keys more than kDaysKept days before the newest one.
   static void dropOldDays(Dictionary& usage);
 };

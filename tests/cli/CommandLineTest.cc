@@ -128,7 +128,7 @@ TEST_F(CommandLine, DailyFromAShellNeedsDebugBeforeIt) {
   EXPECT_EQ(shell.err, "brindlewick: This mode should only be invoked by launchd.\n");
   ToolResult lifted = run({"--debug", "--daily", "-f", store.path()});
   EXPECT_NE(lifted.status, 64);
-  EXPECT_EQ(lifted.err.find("launchd"), std::string::npos);
+  EXPECT_EQ(lifted.err.find("should only be invoked by launchd"), std::string::npos);
   ToolResult withDay = run({"--debug", "--daily", "-d", "today", "-f", store.path()});
   EXPECT_EQ(withDay.status, 64);
   EXPECT_EQ(withDay.err, "brindlewick: --daily mode should not have a specified domain\n");

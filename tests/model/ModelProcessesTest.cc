@@ -2,6 +2,7 @@
 
 #include "Records/LogStartsV1.h"
 #include "model/Model.h"
+#include "model/ModelUsage.h"
 #include "summarizers/ProcessRecords.h"
 #include "summarizers/ProcessSummarizer.h"
 #include "time/BootTimeline.h"
@@ -62,6 +63,22 @@ TEST_F(ModelProcesses, TheThreeOperationsSummarizeJobsOverRelativeAndAbsoluteRan
   EXPECT_EQ(cpuMs(absolute, "App"), 10);
   EXPECT_EQ(cpuMs(absolute, "tool"), 0);
   EXPECT_EQ(absolute.stillrunning(), 1u);
+}
+
+TEST_F(ModelProcesses, UsageCountsEveryProcessOnceUnderTheJobThatRunsIt) {
+  const std::optional<ProcessFigures> usage = ModelUsageInputs(*model).processUsage({{0, 3001}});
+  ASSERT_TRUE(usage);
+  EXPECT_DOUBLE_EQ(usage->cpuSeconds, 0.035);
+  double jobSeconds = 0;
+  for (const JobUsage& job : usage->jobs) {
+    jobSeconds += job.cpuSeconds;
+    EXPECT_DOUBLE_EQ(job.powerScore, job.cpuSeconds * 1e9) << job.label;  // no idle wake-ups
+    if (job.label == "App") {
+      EXPECT_DOUBLE_EQ(job.cpuSeconds, 0.030);
+    }
+  }
+  EXPECT_DOUBLE_EQ(jobSeconds, 0.035);
+  EXPECT_EQ(ModelUsageInputs(*model).build(), "23A344");
 }
 
 }  // namespace

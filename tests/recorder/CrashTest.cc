@@ -51,7 +51,7 @@ FileCheck check(const std::string& path, const std::string& scratch) {
   c.wholeRecords = trimmed.records;
   c.tornBytes = trimmed.trimmedBytes;
   RecordPool pool;
-  const FileRecords read = readStatsFile(path, Options{}, pool);
+  const FileRecords read = readStatsFile(path, StoreQuery{}, pool);
   c.readerKeepsAllWhole = !read.damaged && read.records.size() == trimmed.records;
   return c;
 }
@@ -110,7 +110,7 @@ TEST(RecorderCrash, SigkillWhileWritingLosesAtMostTheLastRecord) {
   for (const auto& [path, count] : whole) {
     SCOPED_TRACE(path);
     RecordPool pool;
-    const FileRecords read = readStatsFile(path, Options{}, pool);
+    const FileRecords read = readStatsFile(path, StoreQuery{}, pool);
     EXPECT_FALSE(read.damaged);
     EXPECT_EQ(read.records.size(), count);  // every whole record survived its repair
     const auto trimmed = recorder::trimTornTail(path);

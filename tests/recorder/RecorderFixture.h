@@ -9,7 +9,7 @@
 #include <string>
 #include <vector>
 
-#include "cli/Options.h"
+#include "store/StoreQuery.h"
 #include "recorder/Clock.h"
 #include "store/RecordReader.h"
 #include "support/TempDir.h"
@@ -57,9 +57,9 @@ struct StoreContents {
       if (e.path().extension() == ".stats") paths.push_back(e.path().string());
     }
     std::sort(paths.begin(), paths.end());
-    Options options;
+    StoreQuery query;
     for (const auto& p : paths) {
-      const FileRecords file = readStatsFile(p, options, pool);
+      const FileRecords file = readStatsFile(p, query, pool);
       EXPECT_FALSE(file.damaged) << p;
       EXPECT_FALSE(file.records.empty()) << p;
       records.insert(records.end(), file.records.begin(), file.records.end());

@@ -47,21 +47,22 @@ class Usage : public ::testing::Test {
 
 TEST_F(Usage, DayHoldsWholeSecondsOfEachStateAndTheBatteryDrain) {
   const Dictionary usage = UsageSummarizer::usageOfDay(day, ModelUsageInputs(model));
-  const Dictionary expected{{"Wake", Value(7200)},    {"Sleep", Value(3600)},       {"DarkWake", Value(0)},
-                            {"Standby", Value(1800)}, {"UserActive", Value(3600)},  {"OnBattery", Value(3600)},
-                            {"OnAC", Value(82800)},   {"BatteryDrain", Value(1000)}};
-  EXPECT_EQ(usage, expected);  // no process accounting yet: no CPU time, no jobs
+  const Dictionary expected{{"Wake", Value(7200)},      {"Sleep", Value(3600)},        {"DarkWake", Value(0)},
+                            {"Standby", Value(1800)},   {"UserActive", Value(3600)},   {"OnBattery", Value(3600)},
+                            {"OnAC", Value(82800)},     {"BatteryDrain", Value(1000)}, {"CPUTime", Value(0.0)},
+                            {"TopJobs", Value(Array{})}};
+  EXPECT_EQ(usage, expected);  // process accounting without process records
 }
 
 // The model's answers with process figures given by the test.
 struct WithProcesses : ModelUsageInputs {
-  WithProcesses(const Model& model, ProcessUsage p) : ModelUsageInputs(model), processes(std::move(p)) {}
-  std::optional<ProcessUsage> processUsage(const std::vector<Range>&) const override { return processes; }
-  ProcessUsage processes;
+  WithProcesses(const Model& model, ProcessFigures p) : ModelUsageInputs(model), processes(std::move(p)) {}
+  std::optional<ProcessFigures> processUsage(const std::vector<Range>&) const override { return processes; }
+  ProcessFigures processes;
 };
 
 TEST_F(Usage, TopJobsAreTheFiveHighestPowerScores) {
-  ProcessUsage p{12.5, {}};
+  ProcessFigures p{12.5, {}};
   for (int i = 1; i <= 7; ++i) p.jobs.push_back(JobUsage{"job" + std::to_string(i), i * 1.0, (i % 4) * 1e9});
   const Dictionary result = UsageSummarizer::usageOfDay(day, WithProcesses(model, p));
   EXPECT_EQ(result.at("CPUTime"), Value(12.5));
@@ -82,7 +83,7 @@ TEST_F(Usage, FileRoundTripsThroughAnXmlPropertyListDroppingOldDaysAndKeepingUnk
   };
   const UsageSummarizer summarizer;
   const WithProcesses inputs(model,
-                             ProcessUsage{1234.567, {JobUsage{"com.example.builder", 1000.25, 1.2345678901e12}}});
+                             ProcessFigures{1234.567, {JobUsage{"com.example.builder", 1000.25, 1.2345678901e12}}});
   summarizer.summarizeUsage(usage, YearMonthDay{2026, 3, 10}, day, inputs);
   summarizer.summarizeUsage(usage, YearMonthDay{2026, 3, 10}, day, inputs);  // reported again
 
@@ -103,6 +104,33 @@ TEST_F(Usage, FileRoundTripsThroughAnXmlPropertyListDroppingOldDaysAndKeepingUnk
   summarizeUsage(reread, YearMonthDay{2026, 3, 11}, day, model);  // through the model's own summarizer
   EXPECT_EQ(reread.size(), 3u);                                   // 2026-02-03 is now too old
   EXPECT_TRUE(reread.count("2026-03-11") && reread.count("Version"));
+}
+
+// The same figures reported as another build.
+struct AsBuild : WithProcesses {
+  AsBuild(const Model& model, ProcessFigures p, std::string b)
+      : WithProcesses(model, std::move(p)), name(std::move(b)) {}
+  std::optional<std::string> build() const override { return name; }
+  std::string name;
+};
+
+TEST_F(Usage, TwoBuildsOfOneDayAddUpAndReportingOneAgainReplacesItsPart) {
+  const UsageSummarizer summarizer;
+  const AsBuild before(model, ProcessFigures{10, {JobUsage{"a", 4, 4e9}, JobUsage{"b", 6, 6e9}}}, "A1");
+  const AsBuild after(model, ProcessFigures{5, {JobUsage{"a", 3, 3e9}}}, "B2");
+  Dictionary usage;
+  summarizer.summarizeUsage(usage, YearMonthDay{2026, 3, 10}, day, before);
+  summarizer.summarizeUsage(usage, YearMonthDay{2026, 3, 10}, day, after);
+  summarizer.summarizeUsage(usage, YearMonthDay{2026, 3, 10}, day, after);  // the run was repeated
+  const Dictionary& today = usage.at("2026-03-10").get<Dictionary>();
+  EXPECT_EQ(today.at("Wake"), Value(2 * 7200));
+  EXPECT_EQ(today.at("BatteryDrain"), Value(2 * 1000));
+  EXPECT_EQ(today.at("CPUTime"), Value(15.0));
+  EXPECT_EQ(
+      today.at("TopJobs"),
+      Value(Array{Value(Dictionary{{"Label", Value("a")}, {"CPUTime", Value(7.0)}, {"PowerScore", Value(7e9)}}),
+                  Value(Dictionary{{"Label", Value("b")}, {"CPUTime", Value(6.0)}, {"PowerScore", Value(6e9)}})}));
+  EXPECT_EQ(today.at("Builds").get<Dictionary>().size(), 2u);
 }
 
 TEST(UsageDay, TheDayIsTheLocalDayOfTheMiddleOfTheRanges) {

@@ -1,0 +1,91 @@
+#include <gtest/gtest.h>
+#include <signal.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <filesystem>
+#include <random>
+#include <thread>
+
+#include "base/Console.h"
+#include "cli/ReportState.h"
+#include "store/AtomicFile.h"
+#include "store/PropertyListReader.h"
+#include "support/FakePlatform.h"
+#include "support/TempDir.h"
+
+namespace bw {
+namespace {
+
+class ReportState : public ::testing::Test {
+ protected:
+  void SetUp() override {
+    setenv("TZ", "UTC", 1);
+    tzset();
+    gDebug = 0;
+    fake.root = root.path();
+    std::filesystem::create_directories(fake.ownStoreDirectory());
+  }
+  test::TempDir root;
+  test::FakePlatform fake;
+};
+
+TEST_F(ReportState, ValuesOfTheWrongTypeCountAsAbsentAndOtherKeysAreKept) {
+  EXPECT_FALSE(copyLastReportYMD());
+  EXPECT_FALSE(copyLastReportBuild());
+  ASSERT_TRUE(writePropertyListFile(
+      stateFilePath(),
+      Value(Dictionary{{"LastReportDate", "yesterday"}, {"LastReportBuild", 7}, {"Keep", Array{1, 2}}})));
+  EXPECT_FALSE(copyLastReportYMD());
+  EXPECT_FALSE(copyLastReportBuild());
+  saveLastReportYMD({2024, 2, 29});
+  saveLastReportBuild("B2");
+  saveLastReportBuild(std::nullopt);  // none sets nothing
+  EXPECT_EQ(copyLastReportYMD(), (YearMonthDay{2024, 2, 29}));
+  EXPECT_EQ(copyLastReportBuild(), "B2");
+  EXPECT_EQ(readPropertyList(stateFilePath())->get<Dictionary>().at("Keep"), Value(Array{1, 2}));
+}
+
+TEST_F(ReportState, AnUnwritableStateFileIsLoggedAndTheRunGoesOn) {
+  std::filesystem::remove_all(fake.ownStoreDirectory());
+  saveLastReportBuild("B2");
+  ASSERT_EQ(fake.assumptionLogLines.size(), 1u);
+  EXPECT_NE(fake.assumptionLogLines[0].find("state.plist"), std::string::npos);
+  EXPECT_FALSE(copyLastReportBuild());
+}
+
+// A child rewrites the file in a loop, alternating two contents, and is
+// killed at a random moment; the file must always hold one of them whole.
+TEST_F(ReportState, AKilledWriterLeavesTheOldOrTheNewFile) {
+  const std::string path = stateFilePath();
+  const Value first(Dictionary{{"LastReportBuild", "A1"}, {"Pad", std::string(4000, 'a')}});
+  const Value second(Dictionary{{"LastReportBuild", "B2"}, {"Pad", std::string(9000, 'b')}});
+  ASSERT_TRUE(writePropertyListFile(path, first));
+  std::mt19937 random(20240101);
+  std::uniform_int_distribution<int> delay(0, 3000);
+  int kills = 0;
+  for (int i = 0; i < 200; ++i) {
+    const pid_t child = fork();
+    ASSERT_GE(child, 0);
+    if (child == 0) {
+      for (int n = 0;; ++n) writePropertyListFile(path, n % 2 ? first : second);
+    }
+    std::this_thread::sleep_for(std::chrono::microseconds(delay(random)));
+    ASSERT_EQ(kill(child, SIGKILL), 0);
+    int status = 0;
+    ASSERT_EQ(waitpid(child, &status, 0), child);
+    ASSERT_TRUE(WIFSIGNALED(status) && WTERMSIG(status) == SIGKILL);
+    ++kills;
+    const std::optional<Value> read = readPropertyList(path);
+    ASSERT_TRUE(read) << "kill " << i;
+    ASSERT_TRUE(*read == first || *read == second) << "kill " << i;
+  }
+  std::size_t leftovers = 0;
+  for (const auto& entry : std::filesystem::directory_iterator(fake.ownStoreDirectory()))
+    leftovers += entry.path().filename() != "state.plist";
+  std::printf("kills: %d, temporary files left by killed writers: %zu\n", kills, leftovers);
+  EXPECT_EQ(kills, 200);
+}
+
+}  // namespace
+}  // namespace bw
