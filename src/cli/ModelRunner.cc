@@ -4,7 +4,7 @@
 #include "cli/Options.h"
 #include "domains/Domain.h"
 #include "domains/PostInstallDomain.h"
-#include "domains/RangeList.h"
+#include "base/RangeList.h"
 #include "model/Model.h"
 
 namespace bw {

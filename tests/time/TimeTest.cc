@@ -537,6 +537,16 @@ TEST(AbsRange, SpansTwoTimesOfOneBootAndRaisesWithThemInTheUserInfo) {
 // this binary runs.
 const bool kZoneSet = [] { return setenv("TZ", "America/New_York", 1) == 0 && (tzset(), true); }();
 
+TEST(Calendar, DayNumbersRoundTripThroughProlepticGregorianDates) {
+  const std::pair<YearMonthDay, std::int64_t> days[] = {{{1970, 1, 1}, 0},       {{1969, 12, 31}, -1},
+                                                        {{2000, 2, 29}, 11016},  {{2024, 2, 5}, 19758},
+                                                        {{1600, 3, 1}, -135080}, {{9999, 12, 31}, 2932896}};
+  for (const auto& [ymd, number] : days) {
+    EXPECT_EQ(daysFromCivil(ymd), number);
+    EXPECT_EQ(civilFromDays(number), ymd);
+  }
+}
+
 TEST(Calendar, DaysAndMidnightsAreLocalAcrossDaylightSaving) {
   ASSERT_TRUE(kZoneSet);
   // Noon in New York a calendar day apart: 23 hours when the clocks go
