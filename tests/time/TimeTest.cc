@@ -79,7 +79,7 @@ List positions(const Timeline& t) {
 
 std::string warning(std::initializer_list<Uuid> left) {
   std::string text = "Warning: could not sequence some boots:\n";
-  for (const Uuid& u : left) text += "\t" + u.string() + "\n";
+  for (const Uuid& u : left) text.append("\t").append(u.string()).append("\n");
   return text;
 }
 
@@ -144,7 +144,7 @@ class TimeTest : public testing::Test {
     for (const auto& [version, timeline] : sequenceBoots(boots_)) {
       text += version + ":";
       for (const auto& boot : timeline->objects())
-        text += " " + static_cast<const BootTimeline&>(*boot).uuid().string().substr(34);
+        text.append(" ").append(static_cast<const BootTimeline&>(*boot).uuid().string().substr(34));
       text += "\n";
     }
     return text + std::exchange(out_, std::ostringstream()).str();
