@@ -32,6 +32,4 @@ std::string Record::serialize() const {
   return bytes;
 }
 
-void Record::copyTo(Record&) const { terminateUnsupported("Record::copyTo"); }
-
 }  // namespace bw

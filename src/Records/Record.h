@@ -70,9 +70,8 @@ class Record {
   // only when present here, repeated fields only when they have elements
   // (they then replace the target's; elements are values, so they are
   // copied). Fields absent here keep the target's. Overrides such as a given
-  // boot UUID are not fields and are not copied. Classes other than the
-  // record classes do not support it (abort).
-  virtual void copyTo(Record& target) const;
+  // boot UUID are not fields and are not copied.
+  virtual void copyTo(Record& target) const = 0;
 
   // A new record with every field (and every override) duplicated.
   virtual std::unique_ptr<Record> copy() const = 0;

@@ -1,7 +1,6 @@
 #pragma once
-// Statistics over a list of numbers, a predicate test over a list and the
-// appending of a non-empty range to a list of ranges. Every element is read
-// as a double.
+// Statistics over a list of numbers and a predicate test over a list. Every
+// element is read as a double.
 //
 //   list::sum({})           == 0
 //   list::mean({})          is NaN
@@ -13,8 +12,6 @@
 #include <limits>
 #include <ranges>
 #include <vector>
-
-#include "base/Range.h"
 
 namespace bw::list {
 
@@ -87,12 +84,3 @@ bool any(const R& list, P&& predicate) {
 }
 
 }  // namespace bw::list
-
-namespace bw {
-
-// Appends (location, length) to `ranges` unless the length is 0.
-inline void addRangeLoc(std::vector<Range>& ranges, std::uint64_t location, std::uint64_t length) {
-  if (length != 0) ranges.push_back(Range{location, length});
-}
-
-}  // namespace bw

@@ -10,7 +10,7 @@
 #include "cli/StoreWatch.h"
 #include "domains/Domain.h"
 #include "domains/PostInstallDomain.h"
-#include "domains/RangeList.h"
+#include "base/RangeList.h"
 #include "model/Model.h"
 #include "summarizers/ModelSummarizers.h"
 

@@ -14,6 +14,7 @@
 #include "base/Console.h"
 #include "base/Platform.h"
 #include "cli/Usage.h"
+#include "time/Calendar.h"
 
 namespace bw {
 
@@ -122,17 +123,12 @@ std::vector<std::string> splitAt(const std::string& s, char sep) {
 bool parseDayArgument(const char* arg, Options& options) {
   std::uint32_t year, month, day;
   if (std::strcmp(arg, "today") == 0 || std::strcmp(arg, "current") == 0 || std::strcmp(arg, "yesterday") == 0) {
-    time_t seconds = static_cast<time_t>(platform().nowMicroseconds() / 1000000);
-    tm local{};
-    localtime_r(&seconds, &local);
-    if (std::strcmp(arg, "yesterday") == 0) {
-      local.tm_mday -= 1;
-      local.tm_isdst = -1;
-      mktime(&local);
-    }
-    year = static_cast<std::uint32_t>(local.tm_year + 1900);
-    month = static_cast<std::uint32_t>(local.tm_mon + 1);
-    day = static_cast<std::uint32_t>(local.tm_mday);
+    Date now{static_cast<double>(platform().nowMicroseconds() / 1000000)};
+    if (std::strcmp(arg, "yesterday") == 0) now = dateOneDayEarlier(now);
+    const YearMonthDay local = yearMonthDayFromDate(now);
+    year = static_cast<std::uint32_t>(local.year);
+    month = static_cast<std::uint32_t>(local.month);
+    day = static_cast<std::uint32_t>(local.day);
   } else {
     if (std::strlen(arg) != 8) return false;
     unsigned long y, m, d;

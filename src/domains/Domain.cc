@@ -23,10 +23,6 @@ std::unique_ptr<Domain> Domain::domainWithSpec(const DomainSpec& spec) {
   }
 }
 
-void Domain::addEvent(const Record&, std::uint64_t, const AbsTime&, std::uint64_t) {
-  terminateUnsupported("Domain::addEvent is abstract");
-}
-
 void Domain::setDomain(bool inside, std::uint64_t position) {
   if (inside != lastDomain_) {
     if (inside) {

@@ -19,8 +19,9 @@ class Domain : public Summarizer {
   // the process.
   static std::unique_ptr<Domain> domainWithSpec(const DomainSpec& spec);
 
-  // Abstract here: every subclass has its own rule. Terminates.
-  void addEvent(const Record& event, std::uint64_t position, const AbsTime& absTime, std::uint64_t wallTime) override;
+  // Every subclass has its own rule.
+  void addEvent(const Record& event, std::uint64_t position, const AbsTime& absTime,
+                std::uint64_t wallTime) override = 0;
 
   // Reports whether the record at `position` is inside: a change opens or
   // closes a range there; no change does nothing.

@@ -8,24 +8,11 @@
 #include <mutex>
 
 #include "base/Console.h"
+#include "time/Calendar.h"
 
 namespace bw {
 
 namespace {
-
-// Year, month and day of a count of days since 1970-01-01 (proleptic
-// Gregorian).
-void civilFromDays(std::int64_t days, std::int64_t& year, unsigned& month, unsigned& day) {
-  days += 719468;
-  const std::int64_t era = (days >= 0 ? days : days - 146096) / 146097;
-  const unsigned dayOfEra = static_cast<unsigned>(days - era * 146097);
-  const unsigned yearOfEra = (dayOfEra - dayOfEra / 1460 + dayOfEra / 36524 - dayOfEra / 146096) / 365;
-  const unsigned dayOfYear = dayOfEra - (365 * yearOfEra + yearOfEra / 4 - yearOfEra / 100);
-  const unsigned mp = (5 * dayOfYear + 2) / 153;
-  day = dayOfYear - (153 * mp + 2) / 5 + 1;
-  month = mp < 10 ? mp + 3 : mp - 9;
-  year = static_cast<std::int64_t>(yearOfEra) + era * 400 + (month <= 2 ? 1 : 0);
-}
 
 std::string formatWithIcu(std::uint64_t ms, bool withOffset) {
   static std::unique_ptr<icu::SimpleDateFormat> formatters[2];
@@ -72,9 +59,9 @@ std::string formatWallTime(std::uint64_t ms) {
     secondOfDay += 86400;
     --days;
   }
-  std::int64_t year;
-  unsigned month, day;
-  civilFromDays(days, year, month, day);
+  const YearMonthDay ymd = civilFromDays(days);
+  const std::int64_t year = ymd.year;
+  const unsigned month = static_cast<unsigned>(ymd.month), day = static_cast<unsigned>(ymd.day);
 
   std::string text;
   if (U_FAILURE(status) || year < 1600 || year > 9999 || (offsetSeconds % 60) != 0) {

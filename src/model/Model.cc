@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "base/Exception.h"
+#include "base/RangeList.h"
 #include "store/RecordPool.h"
 #include "summarizers/DeviceSummarizer.h"
 #include "summarizers/FanSummarizer.h"
@@ -53,41 +54,31 @@ std::vector<std::string> Model::summarizerKeys() const {
   return keys;
 }
 
-std::vector<Range> intersectRangeLists(const std::vector<Range>& a, const std::vector<Range>& b) {
-  std::vector<Range> result;
-  std::size_t i = 0, j = 0;
-  while (i < a.size() && j < b.size()) {
-    const Range overlap = intersectionRange(a[i], b[j]);
-    if (!(overlap == Range{0, 0})) result.push_back(overlap);
-    if (a[i].end() >= b[j].end()) {
-      ++j;
-    } else {
-      ++i;
-    }
-  }
-  return result;
+Summarizer& Model::summarizerForKey(const std::string& key) const {
+  Summarizer* s = summarizer(key);
+  if (!s) throw Exception(kInvalidArgumentException, "no such summarizer: " + key);
+  return *s;
 }
 
 std::optional<std::vector<Range>> Model::rangesForSubstates(const std::vector<std::string>& keys,
                                                             const std::optional<std::vector<Range>>& ranges) const {
   std::optional<std::vector<Range>> result = ranges;
   for (const std::string& key : keys) {
-    const Summarizer* s = summarizer(key);
-    if (!s) throw Exception(kInvalidArgumentException, "no such summarizer: " + key);
-    result = result ? intersectRangeLists(*result, s->ranges()) : s->ranges();
+    const Summarizer& s = summarizerForKey(key);
+    result = result ? intersectRangeLists(*result, s.ranges()) : s.ranges();
   }
   return result;
 }
 
 std::unique_ptr<Summary> Model::summarize(const std::string& key, const Range& range) const {
-  Summarizer* s = summarizer(key);
+  Summarizer* s = &summarizerForKey(key);
   std::unique_ptr<Summary> summary = s->newSummary();
   s->summarize(*summary, range, *timeline_);
   return summary;
 }
 
 std::unique_ptr<Summary> Model::summarize(const std::string& key, const std::vector<Range>& ranges) const {
-  Summarizer* s = summarizer(key);
+  Summarizer* s = &summarizerForKey(key);
   std::unique_ptr<Summary> summary = s->newSummary();
   for (const Range& r : ranges) s->summarize(*summary, r, *timeline_);
   return summary;
@@ -95,7 +86,7 @@ std::unique_ptr<Summary> Model::summarize(const std::string& key, const std::vec
 
 std::vector<std::unique_ptr<Summary>> Model::summarizeTop(const std::string& key, const std::vector<Range>& ranges,
                                                           const std::function<bool(const Summary&)>& filter) const {
-  Summarizer* s = summarizer(key);
+  Summarizer* s = &summarizerForKey(key);
   const SummaryComparator compare = s->comparator();
   std::vector<std::unique_ptr<Summary>> result;
   for (const Range& r : ranges) {
@@ -171,15 +162,6 @@ std::vector<AbsRange> Model::absoluteTimeRangesForRelativeRange(const Range& ran
 
 std::vector<AbsRange> Model::absoluteTimeRangesForRelativeRanges(const std::vector<Range>& ranges) const {
   return timeline_->absoluteRangesForRelativeRanges(ranges);
-}
-
-std::string describeRanges(const std::optional<std::vector<Range>>& ranges) {
-  if (!ranges) return "(null)";
-  Array items;
-  for (const Range& r : *ranges)
-    items.push_back(Value(format("{%llu, %llu}", static_cast<unsigned long long>(r.location),
-                                 static_cast<unsigned long long>(r.length))));
-  return describeValue(Value(items));
 }
 
 }  // namespace bw

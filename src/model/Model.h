@@ -49,6 +49,8 @@ class Model {
   std::optional<std::vector<Range>> rangesForSubstates(const std::vector<std::string>& keys,
                                                        const std::optional<std::vector<Range>>& ranges) const;
 
+  // The summary of the summarizer under `key` over `range` (or `ranges`);
+  // like the two below, throws "no such summarizer: KEY" for an unknown key.
   std::unique_ptr<Summary> summarize(const std::string& key, const Range& range) const;
   std::unique_ptr<Summary> summarize(const std::string& key, const std::vector<Range>& ranges) const;
   // One summary per non-empty overlap of `ranges` with the summarizer's
@@ -98,12 +100,8 @@ class Model {
   std::unique_ptr<Timeline> timeline_;
   std::unordered_map<std::string, std::unique_ptr<Summarizer>> summarizers_;
   std::shared_ptr<const RecordPool> records_;
+
+  Summarizer& summarizerForKey(const std::string& key) const;
 };
-
-// The overlap of two ascending range lists, as a merge walk; never none.
-std::vector<Range> intersectRangeLists(const std::vector<Range>& a, const std::vector<Range>& b);
-
-// The text of a range list in debug lines.
-std::string describeRanges(const std::optional<std::vector<Range>>& ranges);
 
 }  // namespace bw

@@ -32,18 +32,6 @@ void AbsoluteTimeline::adjustSkew(std::int64_t delta) {
   invalidateFrom(parent());
 }
 
-bool AbsoluteTimeline::enumerateTimelinesWithOffset(std::uint64_t, const TimelineBlock&) const {
-  terminateUnsupported("AbsoluteTimeline has no child timelines to enumerate");
-}
-
-std::uint64_t AbsoluteTimeline::wallTimeForRelative(std::uint64_t) const {
-  terminateUnsupported("AbsoluteTimeline wallTimeForRelative needs an offset");
-}
-
-std::optional<AbsTime> AbsoluteTimeline::absoluteTimeForRelative(std::uint64_t) const {
-  terminateUnsupported("AbsoluteTimeline absoluteTimeForRelative needs an offset");
-}
-
 bool AbsoluteTimeline::enumerateEventsWithOffset(std::uint64_t offset, const EventBlock& block) const {
   AbsTime point{bootUuid_, 0};
   bool stop = false;

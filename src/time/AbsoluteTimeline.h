@@ -42,8 +42,6 @@ class AbsoluteTimeline : public Timeline {
   std::uint64_t endWallTime() const override { return std::uint64_t(skew_) + endAbsoluteTime_; }
   std::optional<AbsTime> highestAbsTime() const override { return AbsTime{bootUuid_, endAbsoluteTime_}; }
 
-  // A segment has no child timelines: terminates the process.
-  bool enumerateTimelinesWithOffset(std::uint64_t offset, const TimelineBlock& block) const override;
   bool enumerateEventsWithOffset(std::uint64_t offset, const EventBlock& block) const override;
   // Calls the block once for each record inside some range; the first record
   // past the last range's end ends the segment's walk and returns true.
@@ -54,13 +52,11 @@ class AbsoluteTimeline : public Timeline {
   // 0 before the offset and more than `duration` after it; otherwise
   // startWallTime + (position - offset). The first instant has a wall time.
   std::uint64_t wallTimeForRelative(std::uint64_t position, std::uint64_t offset) const override;
-  // A segment alone has no offset: terminates the process.
-  std::uint64_t wallTimeForRelative(std::uint64_t position) const override;
+  using Timeline::wallTimeForRelative;
   // An AbsTime when 0 < position - offset <= duration: the first instant
   // has none.
   std::optional<AbsTime> absoluteTimeForRelative(std::uint64_t position, std::uint64_t offset) const override;
-  // A segment alone has no offset: terminates the process.
-  std::optional<AbsTime> absoluteTimeForRelative(std::uint64_t position) const override;
+  using Timeline::absoluteTimeForRelative;
   // None when the segment lies wholly outside [from, to]; else one range
   // clipped to it.
   std::vector<AbsRange> absoluteRangesForRelative(std::uint64_t from, std::uint64_t to,

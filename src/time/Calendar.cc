@@ -32,6 +32,31 @@ Date addDays(Date date, int days) {
 
 }  // namespace
 
+// The well-known era-based algorithms (eras of 400 years, 146097 days).
+std::int64_t daysFromCivil(const YearMonthDay& ymd) {
+  const std::int64_t y = ymd.year - (ymd.month <= 2 ? 1 : 0);
+  const std::int64_t era = (y >= 0 ? y : y - 399) / 400;
+  const std::int64_t yoe = y - era * 400;
+  const std::int64_t mp = (ymd.month + 9) % 12;
+  const std::int64_t doy = (153 * mp + 2) / 5 + ymd.day - 1;
+  const std::int64_t doe = yoe * 365 + yoe / 4 - yoe / 100 + doy;
+  return era * 146097 + doe - 719468;
+}
+
+YearMonthDay civilFromDays(std::int64_t days) {
+  const std::int64_t z = days + 719468;
+  const std::int64_t era = (z >= 0 ? z : z - 146096) / 146097;
+  const std::int64_t doe = z - era * 146097;
+  const std::int64_t yoe = (doe - doe / 1460 + doe / 36524 - doe / 146096) / 365;
+  const std::int64_t doy = doe - (365 * yoe + yoe / 4 - yoe / 100);
+  const std::int64_t mp = (5 * doy + 2) / 153;
+  YearMonthDay ymd;
+  ymd.day = static_cast<std::int32_t>(doy - (153 * mp + 2) / 5 + 1);
+  ymd.month = static_cast<std::int32_t>(mp < 10 ? mp + 3 : mp - 9);
+  ymd.year = static_cast<std::int32_t>(yoe + era * 400 + (ymd.month <= 2 ? 1 : 0));
+  return ymd;
+}
+
 YearMonthDay yearMonthDayFromDate(Date date) {
   auto cal = calendarCopy();
   UErrorCode status = U_ZERO_ERROR;

@@ -1,7 +1,8 @@
 #pragma once
-// Calendar arithmetic on dates in the process's time zone, on the Gregorian
-// calendar: whole-day steps that keep the wall-clock time across daylight
-// saving changes, and the first instant of a day.
+// Calendar arithmetic: day numbers of the proleptic Gregorian calendar, and
+// on dates in the process's time zone whole-day steps that keep the
+// wall-clock time across daylight saving changes and the first instant of a
+// day.
 #include <cstdint>
 
 #include "base/Date.h"
@@ -14,6 +15,12 @@ struct YearMonthDay {
   std::int32_t day = 0;    // 1-31
   friend bool operator==(const YearMonthDay&, const YearMonthDay&) = default;
 };
+
+// Days since 1970-01-01 of a proleptic Gregorian date, and back; no time
+// zone involved.
+//   daysFromCivil({1970, 1, 1}) == 0, civilFromDays(-1) == {1969, 12, 31}
+std::int64_t daysFromCivil(const YearMonthDay& ymd);
+YearMonthDay civilFromDays(std::int64_t days);
 
 // The year, month and day of `date` in the local time zone.
 YearMonthDay yearMonthDayFromDate(Date date);

@@ -1,8 +1,6 @@
 // The generic operations of the records: decoding and encoding (round trips
 // for every class, exact bytes where the wire form matters, unknown and
 // malformed input, streams), equality, hashing and the two copies.
-#include <google/protobuf/io/coded_stream.h>
-#include <google/protobuf/io/zero_copy_stream_impl_lite.h>
 #include <gtest/gtest.h>
 
 #include <cmath>
@@ -20,7 +18,6 @@ namespace {
 using C = RecordClass;
 using W = test::WireBytes;
 using test::build;
-namespace pbio = google::protobuf::io;
 
 void expectSameRecord(const Record& actual, const Record& expected, const std::string& bytes) {
   EXPECT_TRUE(actual.isEqual(expected)) << expected.description() << "\n" << actual.description();
@@ -184,28 +181,6 @@ TEST(RecordCodec, MalformedInputFailsToDecode) {
   for (const auto& [what, c, bytes] : cases) EXPECT_EQ(test::decode(c, bytes), nullptr) << what;
 }
 
-// A stream handed over in 3-byte chunks: the first record within a limit, the
-// second up to the stream's end, which fails when the stream is cut short.
-TEST(RecordCodec, DecodesWithinALimitAndThenToTheEndOfAChunkedStream) {
-  SystemIO first, second;
-  first.setAbsoluteTime(123456789);
-  first.setNetworkBytesIn(987654321);
-  second.setAbsoluteTime(20);
-  const std::string stream = first.serialize() + second.serialize();
-  for (int shortBy : {0, 1}) {
-    pbio::ArrayInputStream chunks(stream.data(), static_cast<int>(stream.size()) - shortBy, 3);
-    pbio::CodedInputStream input(&chunks);
-    SystemIO a, b;
-    pbio::CodedInputStream::Limit limit = input.PushLimit(static_cast<int>(first.byteSize()));
-    ASSERT_TRUE(a.readFrom(input));
-    input.PopLimit(limit);
-    EXPECT_TRUE(a.isEqual(first));
-    EXPECT_EQ(b.readFrom(input) && b.isEqual(second), shortBy == 0);
-  }
-}
-
-constexpr std::uint64_t kC = 2654435761u;  // the hash multiplier
-
 // Cstates fields with one state per level.
 Dictionary levels(std::initializer_list<int> levels) {
   Array states;
@@ -260,30 +235,6 @@ TEST(RecordEquality, AClearedFlagHidesTheValueEverywhere) {
   energy.setPkgCanyResidency(987);
   energy.setHasPkgCanyResidency(false);
   EXPECT_EQ(energy.prettyPrint(), "PackageEnergyStatistics\t0");
-}
-
-TEST(RecordHash, IsTheXorOfOneTermPerPresentField) {
-  const std::tuple<RecordClass, Dictionary, std::uint64_t> integers[] = {
-      {C::UserIdle, {{"absoluteTime", 3}, {"change", 5}}, (3 * kC) ^ (5 * kC)},
-      {C::BatteryChargeLevel, {{"charge", 2}}, 2 * kC},  // absent optional fields contribute nothing
-      {C::BatteryChargeLevel, {{"charge", 2}, {"instantAmperage", -1}}, (2 * kC) ^ (0 - kC)},
-      {C::BatteryChargeLevel, {{"charge", 2}, {"isFullyCharged", true}}, (2 * kC) ^ kC},
-      {C::SystemIO, {{"absoluteTime", UINT64_MAX}}, UINT64_MAX * kC}};
-  for (const auto& [c, fields, expected] : integers) EXPECT_EQ(build(c, fields)->hash(), expected);
-  // A double's term: its rounded magnitude times the multiplier plus its fraction scaled by 2^64.
-  constexpr std::uint64_t kQuarter = std::uint64_t{1} << 62;
-  const std::pair<double, std::uint64_t> doubles[] = {{0.0, 0},
-                                                      {2.0, 2 * kC},
-                                                      {2.25, 2 * kC + kQuarter},
-                                                      {-2.25, 2 * kC + kQuarter},
-                                                      {2.75, 3 * kC - kQuarter},
-                                                      {0.5, kC - (std::uint64_t{1} << 63)},
-                                                      {18446744073709551616.0 + 4096.0, 4096 * kC},  // modulo 2^64
-                                                      {INFINITY, 0},
-                                                      {NAN, 0}};
-  const std::uint64_t keyOnly = build(C::SmcKey, {{"key", "K"}})->hash();
-  for (auto [d, term] : doubles)
-    EXPECT_EQ(build(C::SmcKey, {{"key", "K"}, {"dvalue", d}})->hash() ^ keyOnly, term) << d;
 }
 
 struct CopyCase {

@@ -158,28 +158,6 @@ TEST(OneLineText, MatchesTheExpectedTextForEveryCase) {
   for (const auto& [c, fields, expected] : cases) EXPECT_EQ(test::build(c, fields)->prettyPrint(), expected);
 }
 
-TEST(RecordClasses, OnlyTheTwelveHaveATextAndOnlySixAWallTime) {
-  const std::set<C> withText = {C::BatteryChargeLevel, C::SleepWake,         C::LogStartsV1,
-                                C::PowerStateChange,   C::Cstates,           C::DeviceChange,
-                                C::FanState,           C::DisplayBrightness, C::UserIdle,
-                                C::ProcessUsage,       C::Interrupts,        C::PackageEnergyStatistics};
-  const std::set<C> withWallTime = {C::SleepWake,        C::LogStartsV0, C::LogStartsV1,
-                                    C::PowerStateChange, C::DateChange,  C::TimeChange};
-  for (RecordClass c : test::allRecordClasses()) {
-    Dictionary times;  // the fields named wallTime and absoluteTime, whatever their keys
-    for (const FieldInfo& f : recordSchema(c).fields) {
-      if (f.name == std::string("wallTime")) times[f.key] = 1700000000000u;
-      if (f.name == std::string("absoluteTime")) times[f.key] = 77u;
-    }
-    const std::unique_ptr<Record> r = test::build(c, times);
-    SCOPED_TRACE(recordClassName(c));
-    EXPECT_EQ(r->prettyPrint().has_value(), withText.count(c) == 1);
-    EXPECT_EQ(r->answersWallTime(), withWallTime.count(c) == 1);
-    EXPECT_EQ(r->wallTime(), withWallTime.count(c) ? 1700000000000u : 0u);
-    EXPECT_EQ(r->absoluteTime(), times.empty() ? 0u : 77u);
-  }
-}
-
 TEST(ProcessUsage, TimeIsNowForRunningOrSampledProcessesAndTheExitOtherwise) {
   const std::pair<std::optional<std::int64_t>, std::uint64_t> cases[] = {{-1, 5000}, {-3, 5000}, {-2, 3000},
                                                                          {0, 3000},  {1, 3000},  {std::nullopt, 3000}};

@@ -43,18 +43,6 @@ TEST(DataSet, KeepsSamplesInPositionOrderWithoutMerging) {
   for (auto [p, index] : indexes) EXPECT_EQ(set.indexForPosition(p), index) << p;
 }
 
-TEST(DataSet, IndexRangeListsSamplesFromLocationUpToEnd) {
-  DataSet set = samples({{10, 1}, {20, 2}, {30, 3}});
-  const std::pair<Range, Range> cases[] = {{{10, 20}, {0, 2}}, {{11, 9}, {2, 0}}, {{11, 10}, {1, 1}}, {{40, 5}, {3, 0}},
-                                           {{0, 100}, {0, 3}}, {{30, 1}, {2, 1}}, {{0, 11}, {0, 1}},  {{0, 10}, {1, 0}},
-                                           {{5, 0}, {1, 0}},   {{20, 0}, {2, 0}}, {{19, 2}, {1, 1}}};
-  for (auto [range, expected] : cases) EXPECT_EQ(set.indexRangeForRange(range), expected) << range.location;
-  EXPECT_EQ(set.indexRangeForRange({15, UINT64_MAX}).length, 0u);  // an end that wraps selects nothing
-  EXPECT_EQ(samples({{10, 1}, {10, 2}, {10, 3}, {20, 4}}).indexRangeForRange({10, 1}), (Range{0, 3}));
-  EXPECT_EQ(DataSet().indexRangeForRange({0, 100}), (Range{DataSet::kNotFound, 0}));
-  EXPECT_EQ(set.valuesInRange({0, 25}), (std::vector<double>{1, 2}));
-}
-
 TEST(DataSet, StatisticsOverTheSamplesInARange) {
   DataSet set = samples({{10, 4}, {20, 1}, {30, 7}, {40, 2}});
   const std::pair<Range, std::vector<double>> cases[] = {
@@ -131,10 +119,6 @@ TEST(ListStatistics, SumMeanMedianMinMaxAndRanges) {
   }
   const std::vector<std::uint64_t> counts{1, 2, 4};  // integer elements are read as doubles
   expectSame({list::mean(counts), list::median(counts)}, {7.0 / 3, 2}, "integers");
-
-  std::vector<Range> ranges;  // an empty range is not added
-  for (std::uint64_t length : {0, 5}) addRangeLoc(ranges, 10, length);
-  EXPECT_EQ(ranges, (std::vector<Range>{{10, 5}}));
 }
 
 template <class T = Interpolator>
@@ -215,28 +199,6 @@ TEST(SawtoothInterpolator, AFallingValueOpensASegmentAndTheSlopeSkipsTheReset) {
   EXPECT_EQ(s.current(), &s.segments()[1]);
   EXPECT_EQ(s.last_value(), 7);
   expectSame({s.averageSlopeFrom(0, 40)}, {(10.0 + 4.0) / (20.0 + 10.0)}, "across the reset");
-}
-
-TEST(SawtoothInterpolator, AverageSlopeOverPartsOfSegments) {
-  // Segments {(0,0), (10,5), (20,10)}, {(30,3), (40,7)}, {(50,1), (60,3)}.
-  auto s = series<SawtoothInterpolator>({{10, 5}, {20, 10}, {30, 3}, {40, 7}, {50, 1}, {60, 3}});
-  ASSERT_EQ(s.segments().size(), 3u);
-  const std::tuple<const char*, std::uint64_t, std::uint64_t, double> cases[] = {
-      // NaN: no answer
-      {"equal ends", 25, 25, 0},
-      {"inside the first segment", 5, 15, 0.5},
-      {"whole middle segment", 25, 45, 0.4},
-      {"from inside the first to inside the second", 15, 35, (10 - 7.5 + 5 - 3) / (5.0 + 5.0)},
-      {"across all three", 0, 60, (10.0 + 4 + 2) / (20 + 10 + 10)},
-      {"starting in a gap", 22, 40, 4.0 / 10.0},
-      {"past the end extends the last line", 50, 80, 6.0 / 30.0},
-      {"inside one gap", 22, 28, NAN},
-      {"starting past every segment covers nothing", 70, 80, NAN},
-      {"ending in a gap", 5, 25, (10 - 2.5) / 15.0}};
-  for (auto [what, from, to, expected] : cases) expectSame({s.averageSlopeFrom(from, to)}, {expected}, what);
-  auto single = series<SawtoothInterpolator>({{10, 5}, {20, 10}, {30, 3}});  // a last one-sample segment: no line
-  const double extended = series<SawtoothInterpolator>({{10, 5}}).averageSlopeFrom(0, 20);  // (0,0)-(10,5) extended
-  expectSame({single.averageSlopeFrom(0, 40), single.averageSlopeFrom(0, 20), extended}, {NAN, 0.5, 0.5}, "last");
 }
 
 TEST(SawtoothInterpolator, RefusesAPositionBeforeTheCurrentSegmentsEnd) {

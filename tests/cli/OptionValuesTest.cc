@@ -165,6 +165,7 @@ TEST_F(OptionValues, LaunchdTestHappensWhenTheOptionIsRead) {
   EXPECT_EQ(shell.status, 64);
   EXPECT_EQ(shell.err, "brindlewick: This mode should only be invoked by launchd.\n");
   EXPECT_EQ(parse({"--xpc-debug"}).options.mode(), kModeServiceDebug);
+  EXPECT_EQ(parse({"--debug", "--daily"}).status, 0);  // debug first lifts the test
 }
 
 TEST_F(OptionValues, DailyWithASampleRangeIsRefused) {

@@ -148,15 +148,5 @@ TEST(Domain, TheSpecChoosesTheDomainAndItsBounds) {
   }
 }
 
-class BareDomain : public Domain {};
-
-TEST(DomainDeathTest, UnknownTypeAndTheAbstractEventRuleTerminate) {
-  DomainSpec spec;
-  spec.type = 4;
-  EXPECT_DEATH(Domain::domainWithSpec(spec), "unknown domain type");
-  BareDomain bare;
-  EXPECT_DEATH(feed(bare, idle(), 0), "abstract");
-}
-
 }  // namespace
 }  // namespace bw

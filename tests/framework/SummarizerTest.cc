@@ -1,20 +1,13 @@
 #include <gtest/gtest.h>
 
-#include "Records/SleepWake.h"
-#include "Records/UserIdle.h"
 #include "framework/Summarizer.h"
+#include "support/Records.h"
 
 namespace bw {
 namespace {
 
-const Uuid kBoot1 = *Uuid::parse("00000000-0000-0000-0000-000000000001");
-const Uuid kBoot2 = *Uuid::parse("00000000-0000-0000-0000-000000000002");
-
-UserIdle idle(std::uint32_t change) {
-  UserIdle u;
-  u.setChange(change);
-  return u;
-}
+const Uuid kBoot1 = test::bootNamed(1);
+const Uuid kBoot2 = test::bootNamed(2);
 
 // A summarizer of UserIdle records whose handler answers the record's
 // `change` (so 0 ends, 1 holds, 0xFFFFFFFF reads as -1: no change).
@@ -26,7 +19,7 @@ struct IdleSummarizer : Summarizer {
     });
   }
   void feed(std::uint64_t position, std::uint32_t change, const Uuid& boot = kBoot1) {
-    addEvent(idle(change), position, AbsTime::timeWithBoot(boot, position), 0);
+    addEvent(test::idle(0, change), position, AbsTime::timeWithBoot(boot, position), 0);
   }
 };
 
@@ -153,7 +146,7 @@ TEST(Summarizer, ContextsAreMadePerBootAndAFreshContextIsABootChange) {
   ASSERT_NE(s.contextForBoot(kBoot1), nullptr);
   EXPECT_EQ(static_cast<CountingContext*>(s.contextForBoot(kBoot1))->records, 3);
   EXPECT_EQ(static_cast<CountingContext*>(s.contextForBoot(kBoot2))->records, 1);
-  EXPECT_EQ(s.contextForBoot(*Uuid::parse("00000000-0000-0000-0000-000000000009")), nullptr);
+  EXPECT_EQ(s.contextForBoot(test::bootNamed(9)), nullptr);
 }
 
 }  // namespace

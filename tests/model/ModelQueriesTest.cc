@@ -1,5 +1,7 @@
 #include <gtest/gtest.h>
 
+#include <functional>
+
 #include "base/Exception.h"
 #include "model/Model.h"
 
@@ -49,19 +51,30 @@ TEST_F(ModelQueries, KeysIntersectTheirStatesWithinTheGivenRanges) {
   EXPECT_EQ(model.rangesForSubstates({"Even", "Late"}, std::nullopt), std::vector<Range>{});
 }
 
-TEST_F(ModelQueries, TouchingRangesLeaveAnEmptyRangeAtTheTouchingPoint) {
-  EXPECT_EQ(intersectRangeLists({{0, 10}, {20, 10}}, {{10, 10}}), (std::vector<Range>{{10, 0}, {20, 0}}));
-  EXPECT_EQ(intersectRangeLists({{0, 5}}, {{6, 5}}), std::vector<Range>{});
-}
-
-TEST_F(ModelQueries, AnUnknownKeyIsAnInvalidArgument) {
-  try {
-    model.rangesForSubstates({"Even", "Nope"}, std::nullopt);
-    FAIL() << "no exception";
-  } catch (const Exception& e) {
-    EXPECT_EQ(e.name(), kInvalidArgumentException);
-    EXPECT_EQ(e.reason(), "no such summarizer: Nope");
-    EXPECT_TRUE(e.userInfo().empty());
+TEST_F(ModelQueries, AnUnknownKeyIsAnInvalidArgumentForEveryQuery) {
+  const std::function<void()> queries[] = {
+      [&] {
+        model.rangesForSubstates({"Even", "Nope"}, std::nullopt);
+      },
+      [&] {
+        model.summarize("Nope", Range{0, 1});
+      },
+      [&] {
+        model.summarize("Nope", std::vector<Range>{{0, 1}});
+      },
+      [&] {
+        model.summarizeTop("Nope", {{0, 1}}, [](const Summary&) { return true; });
+      },
+  };
+  for (const auto& query : queries) {
+    try {
+      query();
+      ADD_FAILURE() << "no exception";
+    } catch (const Exception& e) {
+      EXPECT_EQ(e.name(), kInvalidArgumentException);
+      EXPECT_EQ(e.reason(), "no such summarizer: Nope");
+      EXPECT_TRUE(e.userInfo().empty());
+    }
   }
 }
 

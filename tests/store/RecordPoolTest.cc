@@ -20,7 +20,7 @@ Record* addRecord(RecordPool& pool, int i) {
   switch (i % 3) {
     case 0: {
       auto* p = pool.create<ProcessUsage>();
-      p->setName("a process name well beyond the inline string buffer #" + std::to_string(i));
+      p->setName(std::string("a process name well beyond the inline string buffer #").append(std::to_string(i)));
       p->setPid(static_cast<std::uint64_t>(i));
       return p;
     }
@@ -44,7 +44,7 @@ bool intact(const Record* r, int i) {
   switch (i % 3) {
     case 0: {
       const auto* p = recordCast<ProcessUsage>(r);
-      return p != nullptr && p->pid() == n && p->name().ends_with("#" + std::to_string(i));
+      return p != nullptr && p->pid() == n && p->name().ends_with(std::string("#").append(std::to_string(i)));
     }
     case 1: {
       const auto* c = recordCast<Cstates>(r);

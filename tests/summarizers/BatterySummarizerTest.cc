@@ -104,8 +104,8 @@ TEST(BatterySummary, UnknownChargeHalvesRangesOfAtLeast60002Milliseconds) {
 TEST(BatteryFeed, SecondSampleAfterAWakeExtendsTheCurvesBackToTheWake) {
   BatterySummarizer s;
   feed(s, level(5000, 6000, 12000), 100);
-  feed(s, test::sleepWake(0), 200);
-  feed(s, test::sleepWake(1), 1000);
+  feed(s, test::sleepWake(0, 0, 0), 200);
+  feed(s, test::sleepWake(0, 0, 1), 1000);
   feed(s, level(4900, 6000, 11900), 2000);
   EXPECT_EQ(s.graphPoints(), (Points{100, 2000}));
   feed(s, level(4800, 6000, 11800), 3000);
@@ -119,13 +119,13 @@ TEST(BatteryFeed, SecondSampleAfterAWakeExtendsTheCurvesBackToTheWake) {
 
 TEST(BatteryFeed, SleepCancelsTheExtensionAndOnlyANewBootResetsTheRange) {
   BatterySummarizer s;
-  feed(s, test::sleepWake(1), 10);
-  feed(s, test::sleepWake(0), 20);
+  feed(s, test::sleepWake(0, 0, 1), 10);
+  feed(s, test::sleepWake(0, 0, 0), 20);
   feed(s, level(5000, 6000), 30);
   feed(s, level(4900, 6000), 40);
-  feed(s, test::logStarts(1), 45);
+  feed(s, test::logStart(test::bootNamed(1)), 45);
   feed(s, level(4800, 6000), 50);
-  feed(s, test::logStarts(1), 55);  // the same boot again
+  feed(s, test::logStart(test::bootNamed(1)), 55);  // the same boot again
   feed(s, level(4700, 6000), 60);
   EXPECT_EQ(s.graphPoints(), (Points{30, 40, 50, 60}));
   EXPECT_EQ(s.ranges(), (Ranges{{30, 10}, {50, 10}}));
@@ -138,7 +138,7 @@ TEST(BatteryFeed, FullChargeFromEitherRecordAndPercentStaysWithin0To100) {
   full.setIsFullyCharged(true);
   feed(s, full, 10);
   EXPECT_EQ(s.last_fully_charged_time(), 10u);
-  feed(s, test::powerChange(0, true), 20);
+  feed(s, test::powerChange(0, 0, 0, true), 20);
   feed(s, test::powerChange(1), 30);
   EXPECT_EQ(s.last_fully_charged_time(), 20u);
   feed(s, level(3001, 6001), 40);

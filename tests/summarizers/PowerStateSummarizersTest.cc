@@ -34,9 +34,9 @@ const DeviceChange kNeutral = test::device(1, 1);
 TEST(PowerStates, SleepThenDarkWakeThenWakeSplitTheTimeline) {
   States states;
   states.add(kNeutral, 0);
-  states.add(test::sleepWake(0), 100);
-  states.add(test::sleepWake(2), 150);
-  states.add(test::sleepWake(1), 200);
+  states.add(test::sleepWake(0, 0, 0), 100);
+  states.add(test::sleepWake(0, 0, 2), 150);
+  states.add(test::sleepWake(0, 0, 1), 200);
   EXPECT_EQ(states["Sleep"], (Ranges{{100, 50}}));
   EXPECT_EQ(states["DarkWake"], (Ranges{{150, 50}}));
   EXPECT_EQ(states["Wake"], (Ranges{{0, 100}}));  // open again from 200
@@ -47,7 +47,7 @@ TEST(PowerStates, SleepThenDarkWakeThenWakeSplitTheTimeline) {
 TEST(PowerStates, OnlyWakeAndActiveStartAtBootAndEveryStateEndsAtShutdown) {
   States states;
   states.add(kNeutral, 10);
-  states.add(test::sleepWake(0), 20);
+  states.add(test::sleepWake(0, 0, 0), 20);
   states.add(kNeutral, 30);
   states.add(kNeutral, 40, 2);
   states.add(kNeutral, 60, 2);
@@ -62,9 +62,9 @@ TEST(PowerStates, OnlyWakeAndActiveStartAtBootAndEveryStateEndsAtShutdown) {
 TEST(PowerStates, PowerSourceAndUserIdleFollowTheirCodes) {
   States states;
   states.add(test::powerChange(0), 0);
-  states.add(test::userIdle(1), 30);
+  states.add(test::idle(0, 1), 30);
   states.add(test::powerChange(1), 50);
-  states.add(test::userIdle(0), 70);
+  states.add(test::idle(0, 0), 70);
   states.add(test::powerChange(std::uint64_t{1} << 32), 80);  // compared as 32 bits: external power
   states.finish(100);
   EXPECT_EQ(states["A/C"], (Ranges{{0, 50}, {80, 20}}));

@@ -26,10 +26,10 @@ StandbySummary summarize(const StandbySummarizer& s, Range range, StandbySummary
 
 TEST(Standby, SleepEndedByAWakeFromStandbyIsARangeAndCountsByWakeType) {
   StandbySummarizer s;
-  feed(s, sleepWake(0), 10);
-  feed(s, sleepWake(1, true, "RTC"), 50);
-  feed(s, sleepWake(0), 60);
-  feed(s, sleepWake(2, true), 80);  // no wake type: counted under "__ALL__" only
+  feed(s, sleepWake(0, 0, 0), 10);
+  feed(s, sleepWake(0, 0, 1, "RTC", true), 50);
+  feed(s, sleepWake(0, 0, 0), 60);
+  feed(s, sleepWake(0, 0, 2, "", true), 80);  // no wake type: counted under "__ALL__" only
   EXPECT_EQ(s.ranges(), (std::vector<Range>{{10, 40}, {60, 20}}));
 
   StandbySummary summary = summarize(s, {0, 100});
@@ -49,10 +49,10 @@ TEST(Standby, SleepEndedByAWakeFromStandbyIsARangeAndCountsByWakeType) {
 
 TEST(Standby, OrdinaryWakeDropsTheSleepAndOtherRecordsAreIgnored) {
   StandbySummarizer s;
-  feed(s, sleepWake(0), 10);
+  feed(s, sleepWake(0, 0, 0), 10);
   feed(s, test::device(5, 1), 20);
-  feed(s, sleepWake(1), 30);
-  feed(s, sleepWake(1, true, "RTC"), 40);  // no sleep open: counted, no range
+  feed(s, sleepWake(0, 0, 1), 30);
+  feed(s, sleepWake(0, 0, 1, "RTC", true), 40);  // no sleep open: counted, no range
   EXPECT_TRUE(s.ranges().empty());
   EXPECT_EQ(summarize(s, {0, 100}).wakesFromStandby(), 1u);
 }

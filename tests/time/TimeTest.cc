@@ -79,7 +79,7 @@ List positions(const Timeline& t) {
 
 std::string warning(std::initializer_list<Uuid> left) {
   std::string text = "Warning: could not sequence some boots:\n";
-  for (const Uuid& u : left) text += "\t" + u.string() + "\n";
+  for (const Uuid& u : left) text.append("\t").append(u.string()).append("\n");
   return text;
 }
 
@@ -144,7 +144,7 @@ class TimeTest : public testing::Test {
     for (const auto& [version, timeline] : sequenceBoots(boots_)) {
       text += version + ":";
       for (const auto& boot : timeline->objects())
-        text += " " + static_cast<const BootTimeline&>(*boot).uuid().string().substr(34);
+        text.append(" ").append(static_cast<const BootTimeline&>(*boot).uuid().string().substr(34));
       text += "\n";
     }
     return text + std::exchange(out_, std::ostringstream()).str();
@@ -536,6 +536,16 @@ TEST(AbsRange, SpansTwoTimesOfOneBootAndRaisesWithThemInTheUserInfo) {
 // The calendar reads the zone once, on first use: fix it before any test of
 // this binary runs.
 const bool kZoneSet = [] { return setenv("TZ", "America/New_York", 1) == 0 && (tzset(), true); }();
+
+TEST(Calendar, DayNumbersRoundTripThroughProlepticGregorianDates) {
+  const std::pair<YearMonthDay, std::int64_t> days[] = {{{1970, 1, 1}, 0},       {{1969, 12, 31}, -1},
+                                                        {{2000, 2, 29}, 11016},  {{2024, 2, 5}, 19758},
+                                                        {{1600, 3, 1}, -135080}, {{9999, 12, 31}, 2932896}};
+  for (const auto& [ymd, number] : days) {
+    EXPECT_EQ(daysFromCivil(ymd), number);
+    EXPECT_EQ(civilFromDays(number), ymd);
+  }
+}
 
 TEST(Calendar, DaysAndMidnightsAreLocalAcrossDaylightSaving) {
   ASSERT_TRUE(kZoneSet);

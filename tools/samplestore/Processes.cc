@@ -143,8 +143,9 @@ void Processes::planOwned(const Boot& boot, int program, const std::vector<int>&
       Instance p;
       p.program = program;
       p.name = model.name;
-      if (model.uuidSuffix) p.name += "." + rng_.uuid().string();
-      if (model.numberSuffix) p.name += "." + std::to_string(rng_.between(100, 99'999));
+      // Appended piecewise: "." + string trips GCC 12's -Wrestrict at -O3.
+      if (model.uuidSuffix) p.name.append(".").append(rng_.uuid().string());
+      if (model.numberSuffix) p.name.append(".").append(std::to_string(rng_.between(100, 99'999)));
       p.displayName = model.displayName;
       p.executableUuid = model.executableUuid;
       p.uid = model.uid;

@@ -3,6 +3,8 @@
 #include <cstdio>
 #include <utility>
 
+#include "time/Calendar.h"
+
 namespace bw::samplestore {
 
 const std::vector<ZoneRule>& zoneTable() {
@@ -69,28 +71,14 @@ std::vector<std::uint64_t> savingSwitches(const ZoneRule& rule, std::uint64_t fr
   return result;
 }
 
-// Days from civil and back: the well-known era-based algorithms.
-std::int64_t daysFromCivil(int year, int month, int day) {
-  const std::int64_t y = year - (month <= 2 ? 1 : 0);
-  const std::int64_t era = (y >= 0 ? y : y - 399) / 400;
-  const std::int64_t yoe = y - era * 400;
-  const std::int64_t mp = (month + 9) % 12;
-  const std::int64_t doy = (153 * mp + 2) / 5 + day - 1;
-  const std::int64_t doe = yoe * 365 + yoe / 4 - yoe / 100 + doy;
-  return era * 146097 + doe - 719468;
-}
+std::int64_t daysFromCivil(int year, int month, int day) { return bw::daysFromCivil(YearMonthDay{year, month, day}); }
 
 LocalDate civilFromDays(std::int64_t days) {
-  const std::int64_t z = days + 719468;
-  const std::int64_t era = (z >= 0 ? z : z - 146096) / 146097;
-  const std::int64_t doe = z - era * 146097;
-  const std::int64_t yoe = (doe - doe / 1460 + doe / 36524 - doe / 146096) / 365;
-  const std::int64_t doy = doe - (365 * yoe + yoe / 4 - yoe / 100);
-  const std::int64_t mp = (5 * doy + 2) / 153;
+  const YearMonthDay ymd = bw::civilFromDays(days);
   LocalDate d;
-  d.day = static_cast<int>(doy - (153 * mp + 2) / 5 + 1);
-  d.month = static_cast<int>(mp < 10 ? mp + 3 : mp - 9);
-  d.year = static_cast<int>(yoe + era * 400 + (d.month <= 2 ? 1 : 0));
+  d.year = ymd.year;
+  d.month = ymd.month;
+  d.day = ymd.day;
   d.yday = static_cast<int>(days - daysFromCivil(d.year, 1, 1));
   // 1970-01-01 was a Thursday (weekday 3 counting from Monday).
   d.weekday = static_cast<int>(((days % 7) + 7 + 3) % 7);

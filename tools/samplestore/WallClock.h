@@ -39,7 +39,8 @@ struct LocalDate {
   int weekday = 3;  // 0 = Monday
 };
 
-// Days since 1970-01-01 of a proleptic Gregorian date, and back.
+// Days since 1970-01-01 of a proleptic Gregorian date, and back with the
+// day of the year and of the week.
 std::int64_t daysFromCivil(int year, int month, int day);
 LocalDate civilFromDays(std::int64_t days);
 

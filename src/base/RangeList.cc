@@ -1,10 +1,23 @@
-#include "domains/RangeList.h"
+#include "base/RangeList.h"
 
 #include <algorithm>
 
-#include "accum/ListStatistics.h"
-
 namespace bw {
+
+std::vector<Range> intersectRangeLists(const std::vector<Range>& a, const std::vector<Range>& b) {
+  std::vector<Range> result;
+  std::size_t i = 0, j = 0;
+  while (i < a.size() && j < b.size()) {
+    const Range overlap = intersectionRange(a[i], b[j]);
+    if (!(overlap == Range{0, 0})) result.push_back(overlap);
+    if (a[i].end() >= b[j].end()) {
+      ++j;
+    } else {
+      ++i;
+    }
+  }
+  return result;
+}
 
 std::vector<Range> subtractRanges(const std::vector<Range>& a, const std::vector<Range>& b) {
   std::vector<Range> result;

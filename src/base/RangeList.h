@@ -1,13 +1,22 @@
 #pragma once
 // Arithmetic on lists of location/length ranges that are ascending and
-// non-overlapping, as domains and summarizers keep them. Appending a single
-// non-empty range is `addRangeLoc` (accum/ListStatistics.h).
+// non-overlapping, as summarizers and domains keep them.
 #include <cstdint>
 #include <vector>
 
 #include "base/Range.h"
 
 namespace bw {
+
+// Appends (location, length) to `ranges` unless the length is 0.
+inline void addRangeLoc(std::vector<Range>& ranges, std::uint64_t location, std::uint64_t length) {
+  if (length != 0) ranges.push_back(Range{location, length});
+}
+
+// The overlap of two lists, as a merge walk of intersectionRange: ranges
+// that only touch leave a length-0 range at the touching point.
+//   [(0,10), (20,10)] with [(10,10)] == [(10,0), (20,0)]
+std::vector<Range> intersectRangeLists(const std::vector<Range>& a, const std::vector<Range>& b);
 
 // Every part of a range of `a` that no range of `b` covers, in order. A
 // range cut in the middle gives two pieces; empty pieces never appear.

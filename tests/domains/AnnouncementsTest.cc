@@ -8,7 +8,6 @@
 #include "domains/BootDomain.h"
 #include "domains/DateDomain.h"
 #include "domains/PostInstallDomain.h"
-#include "domains/RangeList.h"
 #include "domains/RelativeTimeDomain.h"
 #include "domains/WallTimeDomain.h"
 #include "domains/WallTimeText.h"
@@ -46,29 +45,6 @@ TEST(DomainAnnouncements, WithoutDebugNothingIsPrintedAndDatesHaveNoOffset) {
   setConsole(nullptr, nullptr);
   EXPECT_EQ(err.str(), "");
   EXPECT_EQ(formatWallTime(1'720'000'000'000), "2024-07-03 11:46:40");  // summer time, +0200
-}
-
-TEST(RangeList, SubtractionCutsSplitsAndDropsWhatIsCovered) {
-  struct Case {
-    Ranges a, b, expected;
-  };
-  const Case cases[] = {
-      {{{0, 400}}, {{100, 50}}, {{0, 100}, {150, 250}}},
-      {{{100, 50}}, {{0, 400}}, {}},
-      {{{0, 100}, {200, 100}}, {{50, 200}}, {{0, 50}, {250, 50}}},  // one cut across two
-      {{{0, 100}}, {{0, 10}, {20, 10}, {90, 30}}, {{10, 10}, {30, 60}}},
-      {{{0, 100}, {300, 10}}, {{100, 200}}, {{0, 100}, {300, 10}}},  // touching only
-      {{{0, 100}}, {{50, 0}}, {{0, 100}}},                           // empty cut
-      {{{0, 10}, {20, 10}}, {}, {{0, 10}, {20, 10}}},
-  };
-  for (const Case& c : cases) {
-    EXPECT_EQ(subtractRanges(c.a, c.b), c.expected);
-  }
-}
-
-TEST(RangeList, TotalLengthSumsLengths) {
-  EXPECT_EQ(totalLength({}), 0u);
-  EXPECT_EQ(totalLength({{0, 100}, {150, 250}}), 350u);
 }
 
 }  // namespace
