@@ -5,12 +5,12 @@
 
 #include "base/Console.h"
 #include "base/Platform.h"
+#include "base/RangeList.h"
 #include "cli/ModelLoader.h"
 #include "cli/Options.h"
 #include "cli/ReportState.h"
 #include "domains/BootDomain.h"
 #include "domains/DateDomain.h"
-#include "domains/RangeList.h"
 #include "model/Model.h"
 #include "model/ModelUsage.h"
 #include "reports/DailyReports.h"

@@ -1,6 +1,6 @@
 #include "reports/Dashboard.h"
 
-#include "domains/RangeList.h"
+#include "base/RangeList.h"
 #include "model/Model.h"
 #include "reports/DashboardSections.h"
 

@@ -3,7 +3,7 @@
 
 #include "base/Console.h"
 #include "base/Duration.h"
-#include "domains/RangeList.h"
+#include "base/RangeList.h"
 #include "model/Model.h"
 #include "reports/DashboardLines.h"
 #include "reports/DashboardSections.h"

@@ -5,7 +5,7 @@
 
 #include "base/Console.h"
 #include "base/Duration.h"
-#include "domains/RangeList.h"
+#include "base/RangeList.h"
 #include "model/Model.h"
 #include "reports/ReportText.h"
 #include "summarizers/CPUSummary.h"

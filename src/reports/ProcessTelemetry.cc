@@ -4,7 +4,7 @@
 // from 1, among the jobs of that stretch ordered by CPU time.
 #include <memory>
 
-#include "domains/RangeList.h"
+#include "base/RangeList.h"
 #include "model/Model.h"
 #include "reports/Telemetry.h"
 #include "summarizers/MemorySummarizer.h"

@@ -4,7 +4,7 @@
 #include <memory>
 
 #include "Records/SleepWake.h"
-#include "domains/RangeList.h"
+#include "base/RangeList.h"
 #include "model/Model.h"
 #include "reports/Telemetry.h"
 #include "summarizers/StandbySummarizer.h"

@@ -4,7 +4,7 @@
 #include <limits>
 
 #include "base/Console.h"
-#include "domains/RangeList.h"
+#include "base/RangeList.h"
 #include "model/Model.h"
 #include "summarizers/CPUSummary.h"
 #include "summarizers/DeviceSummarizer.h"

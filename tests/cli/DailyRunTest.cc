@@ -5,11 +5,11 @@
 #include <sstream>
 
 #include "base/Console.h"
+#include "base/RangeList.h"
 #include "cli/DailyRun.h"
 #include "cli/DailyStore.h"
 #include "cli/Options.h"
 #include "cli/ReportState.h"
-#include "domains/RangeList.h"
 #include "model/Model.h"
 #include "reports/DailyReports.h"
 #include "store/PropertyListReader.h"

@@ -48,7 +48,7 @@ SystemIO io(std::uint64_t abs, std::uint64_t bytesRead) {
   return r;
 }
 BatteryChargeLevel gauge(std::uint64_t abs, std::int64_t charge) {
-  return test::level(abs, charge, std::int64_t{12000});
+  return test::gaugeAt(abs, charge, 12000);
 }
 
 // Two boots of version 20A1, one hour apart (positions are ms from boot A's

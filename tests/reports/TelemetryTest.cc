@@ -67,14 +67,14 @@ class StoreWriter {
     PanelSelfRefresh psr;
     psr.setPsrOn(0), psr.setPsrOff(0);
     add(2000, psr);
-    if (battery_) add(2000, test::level(0, 4000, 12000));
+    if (battery_) add(2000, test::gaugeAt(0, 4000, 12000));
     UserIdle idle;
     idle.setChange(1);
     add(kHour, idle);
-    if (battery_) add(kHour, test::level(0, 3800, 11800));
+    if (battery_) add(kHour, test::gaugeAt(0, 3800, 11800));
     idle.setChange(0);
     add(2 * kHour, idle);
-    if (battery_) add(2 * kHour, test::level(0, 3600, 11700));
+    if (battery_) add(2 * kHour, test::gaugeAt(0, 3600, 11700));
     psr.setPsrOn(1800000), psr.setPsrOff(5400000);
     add(2 * kHour, psr);
     power(3 * kHour, 0);

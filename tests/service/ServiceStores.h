@@ -42,7 +42,7 @@ inline std::vector<ServiceJob> serviceJobs() {
 inline void writeBatteryStore(const std::string& path, const Uuid& bootUuid, const std::string& version,
                               std::uint64_t wallStart) {
   const std::uint64_t skew = wallStart - 1000;
-  auto batteryAt = [](std::uint64_t abs, std::int64_t charge) { return level(abs, charge, std::int64_t{12000}); };
+  auto batteryAt = [](std::uint64_t abs, std::int64_t charge) { return gaugeAt(abs, charge, 12000); };
   auto power = [skew](std::uint64_t abs, std::uint64_t change, bool full) {
     PowerStateChange c;
     c.setAbsoluteTime(abs);

@@ -26,6 +26,19 @@ R make(F set) {
   set(r);
   return r;
 }
+
+// Boot `n` as feed() names it.
+inline Uuid boot(std::uint8_t n) { return bootNamed(n); }
+
+// Records by their state codes alone, at absolute time 0.
+inline SleepWake sleepWake(std::uint32_t reason, bool fromStandby = false, const std::string& wakeType = "") {
+  return make<SleepWake>([&](SleepWake& r) {
+    r.setReason(reason), r.setWakeFromStandby(fromStandby);
+    if (!wakeType.empty()) r.setWakeType(wakeType);
+  });
+}
+inline UserIdle userIdle(std::uint32_t change) {
+  return make<UserIdle>([&](UserIdle& r) { r.setChange(change); });
 }
 
 }  // namespace bw::test

@@ -92,6 +92,14 @@ inline BatteryChargeLevel level(std::int64_t charge, std::int64_t maxCharge, std
   return b;
 }
 
+// A laptop gauge sample at `abs`: 5000 mAh full, 12 cycles.
+inline BatteryChargeLevel gaugeAt(std::uint64_t abs, std::int64_t charge, std::int64_t mV) {
+  BatteryChargeLevel b = level(charge, 5000, mV);
+  b.setAbsoluteTime(abs);
+  b.setCycleCount(12);
+  return b;
+}
+
 inline TimeChange zoneChange(const std::string& zoneName, std::int64_t gmtoff, std::uint64_t abs = 0,
                              std::uint64_t wall = 0) {
   TimeChange t;
