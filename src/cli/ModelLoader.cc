@@ -3,9 +3,8 @@
 #include "base/Console.h"
 #include "cli/Options.h"
 #include "cli/StoreWatch.h"
-#include "model/Model.h"
+#include "model/ModelsFromRecords.h"
 #include "store/RecordReader.h"
-#include "time/BootSequencer.h"
 
 namespace bw {
 
@@ -18,15 +17,15 @@ StoreQuery storeQuery(const Options& options) {
   return query;
 }
 
-DomainSpec domainSpec(const Options& options) {
-  DomainSpec spec;
-  spec.type = options.domain_type();
-  spec.start = options.domain_start();
-  spec.end = options.domain_end();
-  spec.day = YearMonthDay{static_cast<std::int32_t>(options.domain_ymd_year()),
-                          static_cast<std::int32_t>(options.domain_ymd_month()),
-                          static_cast<std::int32_t>(options.domain_ymd_day())};
-  return spec;
+DomainChoice domainChoice(const Options& options) {
+  DomainChoice choice;
+  choice.type = options.domain_type();
+  choice.start = options.domain_start();
+  choice.end = options.domain_end();
+  choice.day = YearMonthDay{static_cast<std::int32_t>(options.domain_ymd_year()),
+                            static_cast<std::int32_t>(options.domain_ymd_month()),
+                            static_cast<std::int32_t>(options.domain_ymd_day())};
+  return choice;
 }
 
 bool feedsSummarizers(const Options& options) {
@@ -47,14 +46,7 @@ std::vector<std::unique_ptr<Model>> loadModels(const Options& options, StoreWatc
   watch.begin(files.size());
   RecordsByBoot read = readStatsFiles(std::vector<std::string>(files.begin(), files.end()), query, &watch);
   watch.step("sequencing boots");
-  auto pool = std::make_shared<RecordPool>(std::move(read.pool));
-  std::vector<std::unique_ptr<Model>> models;
-  for (auto& [version, timeline] : sequenceBoots(read.boots)) {
-    auto model = std::make_unique<Model>(std::move(timeline), version);
-    model->retainRecords(pool);
-    models.push_back(std::move(model));
-  }
-  return models;
+  return modelsFromRecords(std::move(read));
 }
 
 }  // namespace bw

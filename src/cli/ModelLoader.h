@@ -1,11 +1,11 @@
 #pragma once
 // The command line's edge: translates `Options` into what the lower stages
-// take (the store's query, the domain's spec, whether summarizers are fed)
+// take (the store's query, the domain's choice, whether summarizers are fed)
 // and builds the models of a run from them.
 #include <memory>
 #include <vector>
 
-#include "domains/DomainSpec.h"
+#include "domains/DomainChoice.h"
 #include "store/StatsFileList.h"
 #include "store/StoreQuery.h"
 
@@ -16,7 +16,7 @@ class Options;
 class StoreWatch;
 
 StoreQuery storeQuery(const Options& options);
-DomainSpec domainSpec(const Options& options);
+DomainChoice domainChoice(const Options& options);
 // Whether the mode reads summarizers: the record dump and the event listing
 // need only the domains.
 bool feedsSummarizers(const Options& options);

@@ -4,13 +4,13 @@
 
 #include "base/Console.h"
 #include "base/Exception.h"
+#include "base/RangeList.h"
 #include "cli/EmptyResult.h"
 #include "cli/ModelLoader.h"
 #include "cli/Options.h"
 #include "cli/StoreWatch.h"
 #include "domains/Domain.h"
 #include "domains/PostInstallDomain.h"
-#include "base/RangeList.h"
 #include "model/Model.h"
 #include "summarizers/ModelSummarizers.h"
 
@@ -36,7 +36,7 @@ void runPerModel(const Options& options, const ModelAction& action) {
   std::size_t fed = 0;
   for (const std::unique_ptr<Model>& model : models) {
     if (!acted) watch.step(format("feeding model %zu of %zu", ++fed, models.size()));
-    std::unique_ptr<Domain> domain = Domain::domainWithSpec(domainSpec(options));
+    std::unique_ptr<Domain> domain = Domain::domainWithChoice(domainChoice(options));
     std::unique_ptr<PostInstallDomain> postInstall;
     std::vector<Summarizer*> domains{domain.get()};
     if (options.exclude_post_install()) {

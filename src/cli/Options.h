@@ -8,7 +8,7 @@
 
 #include "base/Date.h"
 #include "base/Uuid.h"
-#include "domains/DomainSpec.h"
+#include "domains/DomainChoice.h"
 
 namespace bw {
 

@@ -30,7 +30,7 @@ void runRecordDump(const Options& options) {
   std::size_t fed = 0;
   for (const std::unique_ptr<Model>& model : models) {
     if (!printed) watch.step(format("feeding model %zu of %zu", ++fed, models.size()));
-    std::unique_ptr<Domain> domain = Domain::domainWithSpec(domainSpec(options));
+    std::unique_ptr<Domain> domain = Domain::domainWithChoice(domainChoice(options));
     model->processEventsWithDomains({domain.get()}, feedsSummarizers(options));
     reached = EmptyStage::kNoRange;
     if (domain->ranges().empty()) continue;

@@ -8,18 +8,18 @@
 
 namespace bw {
 
-std::unique_ptr<Domain> Domain::domainWithSpec(const DomainSpec& spec) {
-  switch (spec.type) {
+std::unique_ptr<Domain> Domain::domainWithChoice(const DomainChoice& choice) {
+  switch (choice.type) {
     case kDomainAll:
       return std::make_unique<AllDomain>();
     case kDomainDate:
-      return std::make_unique<DateDomain>(spec.day);
+      return std::make_unique<DateDomain>(choice.day);
     case kDomainWallTime:
-      return std::make_unique<WallTimeDomain>(spec.start, spec.end);
+      return std::make_unique<WallTimeDomain>(choice.start, choice.end);
     case kDomainRelative:
-      return std::make_unique<RelativeTimeDomain>(spec.start, spec.end);
+      return std::make_unique<RelativeTimeDomain>(choice.start, choice.end);
     default:
-      terminateUnsupported("Domain::domainWithSpec: unknown domain type");
+      terminateUnsupported("Domain::domainWithChoice: unknown domain type");
   }
 }
 

@@ -7,7 +7,7 @@
 #include <cstdint>
 #include <memory>
 
-#include "domains/DomainSpec.h"
+#include "domains/DomainChoice.h"
 #include "framework/Summarizer.h"
 
 namespace bw {
@@ -17,7 +17,7 @@ class Domain : public Summarizer {
   // The domain a run asks for: type 0 everything, 1 a calendar day, 2 a
   // wall-clock interval, 3 a span of positions. Any other value terminates
   // the process.
-  static std::unique_ptr<Domain> domainWithSpec(const DomainSpec& spec);
+  static std::unique_ptr<Domain> domainWithChoice(const DomainChoice& choice);
 
   // Every subclass has its own rule.
   void addEvent(const Record& event, std::uint64_t position, const AbsTime& absTime,

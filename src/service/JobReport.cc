@@ -41,10 +41,10 @@ struct ModelRanges {
 
 // The per-model runner over fresh options: the one model of the current
 // boot whose domain has ranges.
-ModelRanges modelInDomain(const StoreQuery& query, const DomainSpec& spec) {
+ModelRanges modelInDomain(const StoreQuery& query, const DomainChoice& choice) {
   ModelRanges found;
   for (std::unique_ptr<Model>& model : loadStoreModels(query)) {
-    std::unique_ptr<Domain> domain = Domain::domainWithSpec(spec);
+    std::unique_ptr<Domain> domain = Domain::domainWithChoice(choice);
     model->processEventsWithDomains({domain.get()}, true);
     if (domain->ranges().empty()) continue;
     if (found.model) throw Exception(kInternalInconsistencyException, "multiple system versions detected");
@@ -69,15 +69,15 @@ MessageDictionary jobReport(const MessageDictionary& request, const std::optiona
   query.fromPath = fromPath;
   query.onlyBoot = platform().currentBootUuid();
   query.onlySystemVersion = platform().currentSystemVersion();
-  DomainSpec spec;
+  DomainChoice choice;
   if (since != 0) {
-    spec.type = kDomainWallTime;
-    spec.end = static_cast<std::uint64_t>(platform().nowMicroseconds() / 1000);
-    spec.start = minusOrZero(spec.end, scaled(since, 1000));
+    choice.type = kDomainWallTime;
+    choice.end = static_cast<std::uint64_t>(platform().nowMicroseconds() / 1000);
+    choice.start = minusOrZero(choice.end, scaled(since, 1000));
   }
 
   if (sampleProcesses) sampleProcesses();
-  ModelRanges found = modelInDomain(query, spec);
+  ModelRanges found = modelInDomain(query, choice);
 
   std::unique_ptr<ProcessSummary> summary;
   std::uint64_t duration = 0;

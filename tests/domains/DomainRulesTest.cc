@@ -124,22 +124,22 @@ TEST(PostInstallDomain, EndsAtTheNextBootAndTreatsAMissingPreviousVersionAsAnUpd
   EXPECT_EQ(domain.ranges(), (Ranges{{100, 3'600'000}}));
 }
 
-TEST(Domain, TheSpecChoosesTheDomainAndItsBounds) {
-  DomainSpec spec;
-  EXPECT_NE(dynamic_cast<AllDomain*>(Domain::domainWithSpec(spec).get()), nullptr);
+TEST(Domain, TheChoiceNamesTheDomainAndItsBounds) {
+  DomainChoice choice;
+  EXPECT_NE(dynamic_cast<AllDomain*>(Domain::domainWithChoice(choice).get()), nullptr);
 
-  spec.type = kDomainDate;
-  spec.day = YearMonthDay{2024, 2, 29};
-  auto date = Domain::domainWithSpec(spec);
+  choice.type = kDomainDate;
+  choice.day = YearMonthDay{2024, 2, 29};
+  auto date = Domain::domainWithChoice(choice);
   auto* day = dynamic_cast<DateDomain*>(date.get());
   ASSERT_NE(day, nullptr);
   EXPECT_EQ(day->components(), (YearMonthDay{2024, 2, 29}));
 
-  spec.start = 100;
-  spec.end = 200;
+  choice.start = 100;
+  choice.end = 200;
   for (std::uint32_t type : {kDomainWallTime, kDomainRelative}) {
-    spec.type = type;
-    auto domain = Domain::domainWithSpec(spec);
+    choice.type = type;
+    auto domain = Domain::domainWithChoice(choice);
     auto* relative = dynamic_cast<RelativeTimeDomain*>(domain.get());
     ASSERT_NE(relative, nullptr);
     EXPECT_EQ(dynamic_cast<WallTimeDomain*>(relative) != nullptr, type == kDomainWallTime);

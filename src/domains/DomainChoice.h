@@ -15,7 +15,7 @@ enum DomainType : std::uint32_t {
   kDomainRelative = 3,  // bounds are timeline positions in milliseconds
 };
 
-struct DomainSpec {
+struct DomainChoice {
   std::uint32_t type = kDomainAll;  // a DomainType
   std::uint64_t start = 0;
   std::uint64_t end = ~std::uint64_t{0};

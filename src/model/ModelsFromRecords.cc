@@ -1,0 +1,18 @@
+#include "model/ModelsFromRecords.h"
+
+#include "time/BootSequencer.h"
+
+namespace bw {
+
+std::vector<std::unique_ptr<Model>> modelsFromRecords(RecordsByBoot read) {
+  auto pool = std::make_shared<RecordPool>(std::move(read.pool));
+  std::vector<std::unique_ptr<Model>> models;
+  for (auto& [version, timeline] : sequenceBoots(read.boots)) {
+    auto model = std::make_unique<Model>(std::move(timeline), version);
+    model->retainRecords(pool);
+    models.push_back(std::move(model));
+  }
+  return models;
+}
+
+}  // namespace bw
