@@ -14,6 +14,7 @@
 #include "reports/DailyReports.h"
 #include "store/PropertyListReader.h"
 #include "support/FakePlatform.h"
+#include "support/MachineFixture.h"
 #include "support/TempDir.h"
 
 namespace bw {
@@ -54,18 +55,13 @@ std::string trace(const std::string& signature, std::uint64_t startMs, std::uint
 
 Date at(std::uint64_t wallMs) { return Date::fromMilliseconds(static_cast<double>(wallMs)); }
 
-class DailyRun : public ::testing::Test {
+class DailyRun : public test::MachineFixture {
  protected:
   void SetUp() override {
-    setenv("TZ", "UTC", 1);
-    tzset();
-    gDebug = 0;
-    fake.root = root.path();
+    MachineFixture::SetUp();
     fake.systemVersion = "B2";
-    std::filesystem::create_directories(fake.ownStoreDirectory());
     options.setFrom_path(store.path());
   }
-  void TearDown() override { gDebug = 0; }
 
   void now(std::uint64_t wallMs) { fake.nowMicros = static_cast<std::int64_t>(wallMs) * 1000; }
   void writeState(const Dictionary& state) { ASSERT_TRUE(writePropertyListFile(stateFilePath(), Value(state))); }
@@ -79,9 +75,7 @@ class DailyRun : public ::testing::Test {
     return reports.calls;
   }
 
-  test::TempDir root;
   test::TempDir store;
-  test::FakePlatform fake;
   Options options;
 };
 

@@ -12,23 +12,13 @@
 #include "store/AtomicFile.h"
 #include "store/PropertyListReader.h"
 #include "support/FakePlatform.h"
+#include "support/MachineFixture.h"
 #include "support/TempDir.h"
 
 namespace bw {
 namespace {
 
-class ReportState : public ::testing::Test {
- protected:
-  void SetUp() override {
-    setenv("TZ", "UTC", 1);
-    tzset();
-    gDebug = 0;
-    fake.root = root.path();
-    std::filesystem::create_directories(fake.ownStoreDirectory());
-  }
-  test::TempDir root;
-  test::FakePlatform fake;
-};
+class ReportState : public test::MachineFixture {};
 
 TEST_F(ReportState, ValuesOfTheWrongTypeCountAsAbsentAndOtherKeysAreKept) {
   EXPECT_FALSE(copyLastReportYMD());

@@ -10,6 +10,7 @@
 #include "model/Model.h"
 #include "summarizers/CPUSummary.h"
 #include "summarizers/IOSummary.h"
+#include "support/Records.h"
 
 namespace bw {
 namespace {
@@ -19,27 +20,12 @@ using test::kBootB;
 using test::kJan1;
 const std::vector<Range> kEverything = {{0, std::uint64_t{1} << 40}};
 
-PackageEnergyStatistics pkg(std::uint64_t abs, std::uint64_t cany) {
-  PackageEnergyStatistics p;
-  p.setAbsoluteTime(abs);
-  p.setPkgCanyResidency(cany);
-  p.setPkgFreq(2000);
-  return p;
-}
-
 PowerStateChange power(std::uint64_t abs, std::uint64_t wallBase, std::uint64_t change) {
   PowerStateChange p;
   p.setAbsoluteTime(abs);
   p.setWallTime(wallBase + abs);
   p.setChange(change);
   return p;
-}
-
-SystemIO io(std::uint64_t abs, std::uint64_t bytesRead) {
-  SystemIO r;
-  r.setAbsoluteTime(abs);
-  r.setDiskBytesRead(bytesRead);
-  return r;
 }
 
 // Boot A: on A/C until 3 minutes; package residency rises 0.5 per ms until
@@ -55,16 +41,16 @@ class CPUAndIOQueries : public ::testing::Test {
     a.append(test::logStart(kBootA, 1000, wallA + 1000, "20A1", nullptr));
     a.append(power(1000, wallA, 0));
     const std::uint64_t canyA[] = {30000, 84000, 114000, 132000, 180000, 180000};
-    for (int k = 0; k < 6; ++k) a.append(pkg(60000 * (k + 1) - (k == 5 ? 1 : 0), canyA[k]));
+    for (int k = 0; k < 6; ++k) a.append(test::packageSample(60000 * (k + 1) - (k == 5 ? 1 : 0), canyA[k]));
     a.append(power(180000, wallA, 1));
-    a.append(io(1000, 0)), a.append(io(61000, 500)), a.append(io(121000, 5500));
+    a.append(test::diskRead(1000, 0)), a.append(test::diskRead(61000, 500)), a.append(test::diskRead(121000, 5500));
     a.writeTo(dir.write("var/db/brindlewick/A.stats"));
 
     StatsFileWriter b;
     b.append(test::logStart(kBootB, 500, wallB + 500, "20A1", &kBootA, "20A1"));
     b.append(power(500, wallB, 0));
-    b.append(pkg(60000, 6000)), b.append(pkg(180000, 114000));
-    b.append(io(500, 0)), b.append(io(60500, 2000));
+    b.append(test::packageSample(60000, 6000)), b.append(test::packageSample(180000, 114000));
+    b.append(test::diskRead(500, 0)), b.append(test::diskRead(60500, 2000));
     b.writeTo(dir.write("var/db/brindlewick/B.stats"));
 
     options.setFrom_path(dir.path());

@@ -27,13 +27,6 @@ using test::Sample;
 
 constexpr std::uint64_t kMiB = 1048576, kGiB = 1073741824;
 
-PackageEnergyStatistics pkg(std::uint64_t abs, std::uint64_t residency) {
-  PackageEnergyStatistics p;
-  p.setAbsoluteTime(abs);
-  p.setPkgCanyResidency(residency);
-  p.setPkgFreq(2000);
-  return p;
-}
 PowerStateChange power(std::uint64_t abs, std::uint64_t wall, std::uint64_t change) {
   PowerStateChange p;
   p.setAbsoluteTime(abs);
@@ -41,15 +34,7 @@ PowerStateChange power(std::uint64_t abs, std::uint64_t wall, std::uint64_t chan
   p.setChange(change);
   return p;
 }
-SystemIO io(std::uint64_t abs, std::uint64_t bytesRead) {
-  SystemIO r;
-  r.setAbsoluteTime(abs);
-  r.setDiskBytesRead(bytesRead);
-  return r;
-}
-BatteryChargeLevel gauge(std::uint64_t abs, std::int64_t charge) {
-  return test::gaugeAt(abs, charge, 12000);
-}
+BatteryChargeLevel gauge(std::uint64_t abs, std::int64_t charge) { return test::gaugeAt(abs, charge, 12000); }
 
 // Two boots of version 20A1, one hour apart (positions are ms from boot A's
 // first record; boot B starts at 7,200,000 by the wall clock).
@@ -67,7 +52,7 @@ void writeTwoBootStore(const test::TempDir& dir, bool laptop) {
   a.append(test::logStart(kBootA, 1000, kJan1 + 1000, "20A1", nullptr));
   a.append(power(1000, kJan1 + 1000, laptop ? 1 : 0));
   if (laptop) a.append(gauge(1000, 4000));
-  a.append(pkg(1000, 500)), a.append(io(1000, 0));
+  a.append(test::packageSample(1000, 500)), a.append(test::diskRead(1000, 0));
   DeviceChange wifi;
   wifi.setAbsoluteTime(1000);
   wifi.setDeviceType(5);
@@ -82,7 +67,7 @@ void writeTwoBootStore(const test::TempDir& dir, bool laptop) {
   idle.setAbsoluteTime(1801000);
   a.append(idle);
   if (laptop) a.append(gauge(3601000, 3500));
-  a.append(pkg(3601000, 500 + 3240000)), a.append(io(3601000, 2 * kGiB));
+  a.append(test::packageSample(3601000, 500 + 3240000)), a.append(test::diskRead(3601000, 2 * kGiB));
   app.at = helper.at = 3601000;
   app.cpuMs = 36000, app.interrupts = 3600, app.idle = 7200;
   helper.cpuMs = 18000, helper.interrupts = 90;
@@ -93,12 +78,12 @@ void writeTwoBootStore(const test::TempDir& dir, bool laptop) {
   b.append(test::logStart(kBootB, 1000, kJan1 + 7201000, "20A1", &kBootA, "20A1"));
   b.append(power(1000, kJan1 + 7201000, 0));
   if (laptop) b.append(gauge(1000, 3500));
-  b.append(pkg(1000, 500));
+  b.append(test::packageSample(1000, 500));
   Sample tool1{.uniqueid = 20, .at = 2000, .name = "Tool", .start = 1500, .resident = kGiB};
   Sample tool2{.uniqueid = 21, .at = 2000, .name = "Tool", .start = 1500, .resident = kGiB};
   b.append(test::processUsage(tool1)), b.append(test::processUsage(tool2));
   if (laptop) b.append(gauge(1801000, 3700));
-  b.append(pkg(1801000, 500 + 1440000));
+  b.append(test::packageSample(1801000, 500 + 1440000));
   tool1.at = tool2.at = 1801000;
   tool1.cpuMs = 60000, tool1.interrupts = 600;
   tool2.cpuMs = 30000, tool2.interrupts = 300;

@@ -17,6 +17,7 @@
 #include "reports/JournalSink.h"
 #include "reports/Telemetry.h"
 #include "support/FakePlatform.h"
+#include "support/MachineFixture.h"
 #include "support/TempDir.h"
 
 namespace bw {
@@ -91,16 +92,12 @@ class StoreWriter {
   StatsFileWriter w_;
 };
 
-class Telemetry : public ::testing::Test {
+class Telemetry : public test::MachineFixture {
  protected:
   void SetUp() override {
-    setenv("TZ", "UTC", 1);
-    tzset();
-    gDebug = 0;
-    fake.root = root.path();
+    MachineFixture::SetUp();
     fake.systemVersion = "B2";
     fake.nowMicros = static_cast<std::int64_t>(kJan1 + 34 * kHour) * 1000;
-    std::filesystem::create_directories(fake.ownStoreDirectory());
     writePropertyListFile(stateFilePath(), Value(Dictionary{{"LastReportDate", Value(Date{(kJan1 - 86400000) / 1e3})},
                                                             {"LastReportBuild", "B2"}}));
     options.setFrom_path(store.path());
@@ -114,7 +111,6 @@ class Telemetry : public ::testing::Test {
     supply.write("BAT0/charge_full_design", "5000000\n");
     supply.write("BAT0/health", "Good\n");
   }
-  void TearDown() override { gDebug = 0; }
 
   // The messages of a daily run over the store.
   std::vector<TelemetryMessage> run(bool battery) {
@@ -125,8 +121,7 @@ class Telemetry : public ::testing::Test {
     return sink.messages;
   }
 
-  test::TempDir root, store, supply;
-  test::FakePlatform fake;
+  test::TempDir store, supply;
   Options options;
 };
 

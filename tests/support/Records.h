@@ -8,8 +8,10 @@
 #include "Records/BatteryChargeLevel.h"
 #include "Records/DeviceChange.h"
 #include "Records/LogStartsV1.h"
+#include "Records/PackageEnergyStatistics.h"
 #include "Records/PowerStateChange.h"
 #include "Records/SleepWake.h"
+#include "Records/SystemIO.h"
 #include "Records/TimeChange.h"
 #include "Records/UserIdle.h"
 #include "base/Uuid.h"
@@ -98,6 +100,23 @@ inline BatteryChargeLevel gaugeAt(std::uint64_t abs, std::int64_t charge, std::i
   b.setAbsoluteTime(abs);
   b.setCycleCount(12);
   return b;
+}
+
+// A package sample at 2000 MHz with its any-C-state residency counter.
+inline PackageEnergyStatistics packageSample(std::uint64_t abs, std::uint64_t residency) {
+  PackageEnergyStatistics p;
+  p.setAbsoluteTime(abs);
+  p.setPkgCanyResidency(residency);
+  p.setPkgFreq(2000);
+  return p;
+}
+
+// An I/O sample with only its disk-read byte counter.
+inline SystemIO diskRead(std::uint64_t abs, std::uint64_t bytesRead) {
+  SystemIO r;
+  r.setAbsoluteTime(abs);
+  r.setDiskBytesRead(bytesRead);
+  return r;
 }
 
 inline TimeChange zoneChange(const std::string& zoneName, std::int64_t gmtoff, std::uint64_t abs = 0,
