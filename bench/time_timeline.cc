@@ -22,7 +22,7 @@ constexpr int kRecordsPerBoot = 50000;
 constexpr int kRecordsPerSegment = 5000;
 constexpr std::uint64_t kWall = 1700000000000ULL;
 
-// The records, allocated in bulk, and the reader-style map of pointers.
+// The records, kept decoded, and the reader-style map of handles.
 struct Run {
   std::vector<bw::LogStartsV1> headers;
   std::vector<bw::SleepWake> wakes;
@@ -40,7 +40,7 @@ struct Run {
       bw::Uuid::Bytes bytes{};
       bytes[0] = std::uint8_t(b + 1);
       const bw::Uuid uuid(bytes);
-      std::vector<bw::Record*>& records = boots[uuid];
+      std::vector<bw::RecordRef>& records = boots[uuid];
       auto& header = headers.emplace_back();
       header.setVersion("1");
       header.setAbsoluteTime(0);

@@ -55,7 +55,10 @@ class Record {
   // the dictionary in the property-list text form.
   std::string description() const;
 
-  // Decodes the message body; false on malformed or truncated input.
+  // Back to a freshly made record of the class: every field absent and zero.
+  virtual void clear() = 0;
+  // Decodes the message body into the fields, merging with what is there
+  // (clear first for a fresh decode); false on malformed or truncated input.
   virtual bool readFrom(google::protobuf::io::CodedInputStream& input) = 0;
   // Encodes the message body, fields in ascending number.
   virtual void writeTo(google::protobuf::io::CodedOutputStream& output) const = 0;

@@ -189,6 +189,13 @@ struct Codec<FieldKind::Bytes> {
   static std::uint64_t hash(const std::string& v) { return hashBytes(v); }
 };
 
+// A field back to its empty value; a string keeps its storage.
+inline void resetField(std::string& v) { v.clear(); }
+template <class T>
+void resetField(T& v) {
+  v = T{};
+}
+
 constexpr bool isObject(FieldKind k) { return k == FieldKind::String || k == FieldKind::Bytes; }
 // A required scalar has no absent state; everything else is present only
 // with its has-flag.
@@ -280,8 +287,10 @@ constexpr bool strictlyAscending(const FieldInfo (&fields)[n]) {
     if (!::bw::record_codec::readElement(input, name##_)) return false; \
     break;
 
-// Records stay in memory for the whole run: no spare element capacity.
-#define BW_CODEC_SHRINK_REPEATED(name, Name, number, Element, key) name##_.shrink_to_fit();
+// Back to the empty state, keeping the storage of strings and element lists
+// for the next decode into the same record.
+#define BW_CODEC_CLEAR(name, Name, number, kind, presence, key) ::bw::record_codec::resetField(name##_);
+#define BW_CODEC_CLEAR_REPEATED(name, Name, number, Element, key) name##_.clear();
 
 #define BW_CODEC_WRITE(name, Name, number, kind, presence, key)                                                   \
   if constexpr (BW_CODEC_REQUIRED(presence) && ::bw::record_codec::isObject(BW_CODEC_KIND(kind))) {               \
@@ -358,10 +367,7 @@ constexpr bool strictlyAscending(const FieldInfo (&fields)[n]) {
     for (;;) {                                                                                                   \
       std::uint64_t key = ::bw::record_codec::WFL::WIRETYPE_END_GROUP;                                           \
       if (!::bw::record_codec::atEnd(input) && !::bw::record_codec::readVarint(input, &key)) return false;       \
-      if ((key & 7) == ::bw::record_codec::WFL::WIRETYPE_END_GROUP) {                                            \
-        REPEATED(BW_CODEC_SHRINK_REPEATED)                                                                       \
-        return true;                                                                                             \
-      }                                                                                                          \
+      if ((key & 7) == ::bw::record_codec::WFL::WIRETYPE_END_GROUP) return true;                                 \
       switch (key >> 3) {                                                                                        \
         FIELDS(BW_CODEC_READ_CASE)                                                                               \
         REPEATED(BW_CODEC_READ_REPEATED_CASE)                                                                    \
@@ -388,6 +394,11 @@ constexpr bool strictlyAscending(const FieldInfo (&fields)[n]) {
       if (!v.isNull()) d.emplace(f.key, std::move(v));                                                           \
     }                                                                                                            \
     return d;                                                                                                    \
+  }                                                                                                              \
+  void Class::clear() {                                                                                          \
+    for (std::uint8_t& bits : has_) bits = 0;                                                                    \
+    FIELDS(BW_CODEC_CLEAR)                                                                                       \
+    REPEATED(BW_CODEC_CLEAR_REPEATED)                                                                            \
   }                                                                                                              \
   std::unique_ptr<::bw::Record> Class::copy() const { return std::make_unique<Class>(*this); }                   \
   void Class::copyTo(::bw::Record& target) const {                                                               \

@@ -165,6 +165,7 @@ class CodedOutputStream;
   bool readFrom(google::protobuf::io::CodedInputStream& input) override;        \
   void writeTo(google::protobuf::io::CodedOutputStream& output) const override; \
   std::size_t byteSize() const override;                                        \
+  void clear() override;                                                        \
   ::bw::Dictionary dictionaryRepresentation() const override;                   \
   std::unique_ptr<::bw::Record> copy() const override;                          \
   void copyTo(::bw::Record& target) const override;                             \

@@ -55,7 +55,7 @@ void StoreWatch::fileRead(const std::string& path, const FileRecords& file) {
   if (file.openError != 0) terminalNote("cannot read " + path + ": " + std::strerror(file.openError));
   if (file.openError != 0 || file.undecodable || file.damaged) ++gDamage.filesNotRead;
   if (file.damaged) {
-    const Uuid boot = static_cast<const LogStartsV1*>(file.records.front())->bootUUID().value_or(Uuid());
+    const Uuid boot = static_cast<const LogStartsV1*>(file.records.front().decoded())->bootUUID().value_or(Uuid());
     if (std::find(gDamage.bootsDropped.begin(), gDamage.bootsDropped.end(), boot) == gDamage.bootsDropped.end()) {
       gDamage.bootsDropped.push_back(boot);
     }

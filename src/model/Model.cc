@@ -4,7 +4,7 @@
 
 #include "base/Exception.h"
 #include "base/RangeList.h"
-#include "store/RecordPool.h"
+#include "store/RecordReader.h"
 #include "summarizers/DeviceSummarizer.h"
 #include "summarizers/FanSummarizer.h"
 #include "summarizers/ModelSummarizers.h"

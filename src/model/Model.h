@@ -20,7 +20,7 @@ namespace bw {
 class ProcessSummarizer;
 class ProcessSummary;
 class DeviceSummarizer;
-class RecordPool;
+struct RecordStorage;
 
 class Model {
  public:
@@ -93,13 +93,13 @@ class Model {
   std::vector<AbsRange> absoluteTimeRangesForRelativeRanges(const std::vector<Range>& ranges) const;
 
   // Keeps the records the timeline points at alive as long as the model.
-  void retainRecords(std::shared_ptr<const RecordPool> pool) { records_ = std::move(pool); }
+  void retainRecords(std::shared_ptr<const RecordStorage> storage) { records_ = std::move(storage); }
 
  private:
   std::string systemVersion_;
   std::unique_ptr<Timeline> timeline_;
   std::unordered_map<std::string, std::unique_ptr<Summarizer>> summarizers_;
-  std::shared_ptr<const RecordPool> records_;
+  std::shared_ptr<const RecordStorage> records_;
 
   Summarizer& summarizerForKey(const std::string& key) const;
 };

@@ -5,11 +5,11 @@
 namespace bw {
 
 std::vector<std::unique_ptr<Model>> modelsFromRecords(RecordsByBoot read) {
-  auto pool = std::make_shared<RecordPool>(std::move(read.pool));
+  auto storage = std::make_shared<RecordStorage>(std::move(read.storage));
   std::vector<std::unique_ptr<Model>> models;
   for (auto& [version, timeline] : sequenceBoots(read.boots)) {
     auto model = std::make_unique<Model>(std::move(timeline), version);
-    model->retainRecords(pool);
+    model->retainRecords(storage);
     models.push_back(std::move(model));
   }
   return models;

@@ -3,14 +3,20 @@
 #include <google/protobuf/io/coded_stream.h>
 
 #include <algorithm>
+#include <atomic>
+#include <climits>
+#include <condition_variable>
+#include <exception>
+#include <mutex>
 #include <optional>
+#include <thread>
 #include <unordered_set>
 
 #include "Records/LogStartsV1.h"
+#include "Records/RecordDecoder.h"
 #include "base/Console.h"
 #include "base/Exception.h"
 #include "base/Platform.h"
-#include "store/MappedFile.h"
 #include "store/RecordTypeTable.h"
 #include "store/StatsFileList.h"
 
@@ -49,7 +55,7 @@ class FrameCursor {
   // The next body's bytes; none at the end of the data. A length running
   // past the end is a decoding failure when the body has a class, and the
   // end of the data when it has none.
-  std::optional<std::pair<const std::uint8_t*, std::size_t>> nextBody(bool hasClass) {
+  std::optional<std::span<const std::uint8_t>> nextBody(bool hasClass) {
     const bool bytesLeft = pos_ < size_;
     std::uint32_t length = 0;
     if (!readLength(&length)) {
@@ -64,7 +70,7 @@ class FrameCursor {
     }
     const std::uint8_t* body = data_ + pos_;
     pos_ += length;
-    return std::make_pair(body, static_cast<std::size_t>(length));
+    return std::span(body, length);
   }
 
  private:
@@ -89,46 +95,38 @@ class FrameCursor {
   std::size_t pos_ = 0;
 };
 
-Record* decodeBody(RecordClass c, const std::uint8_t* body, std::size_t length, RecordPool& pool) {
+[[noreturn]] void failToDecode(RecordClass c) {
+  throw DecodeFailure{std::string("failed to decode a ") + recordClassName(c) + " record"};
+}
+
+void checkLength(std::span<const std::uint8_t> body) {
   // The coded stream counts in int: a longer body cannot be read.
-  if (length > static_cast<std::size_t>(INT32_MAX)) throw DecodeFailure{"message too long"};
-  Record* record = pool.create(c);
-  google::protobuf::io::CodedInputStream input(body, static_cast<int>(length));
-  if (!record->readFrom(input)) {
-    throw DecodeFailure{std::string("failed to decode a ") + recordClassName(c) + " record"};
-  }
-  return record;
+  if (body.size() > static_cast<std::size_t>(INT_MAX)) throw DecodeFailure{"message too long"};
 }
 
-void debugLine(const std::string& line) {
-  if (gDebug) err() << line << "\n";
+// A header decoded for keeps.
+std::unique_ptr<Record> decodeHeader(std::span<const std::uint8_t> body) {
+  checkLength(body);
+  auto header = std::make_unique<LogStartsV1>();
+  google::protobuf::io::CodedInputStream input(body.data(), static_cast<int>(body.size()));
+  if (!header->readFrom(input)) failToDecode(RecordClass::LogStartsV1);
+  return header;
 }
 
-const LogStartsV1& asHeader(const Record* r) { return *static_cast<const LogStartsV1*>(r); }
+const LogStartsV1& asHeader(const RecordRef& r) { return *static_cast<const LogStartsV1*>(r.decoded()); }
 
-Uuid bootOf(const Record* header) { return asHeader(header).bootUUID().value_or(Uuid()); }
+Uuid bootOf(const RecordRef& header) { return asHeader(header).bootUUID().value_or(Uuid()); }
 
-}  // namespace
-
-FileRecords readStatsFile(const std::string& path, const StoreQuery& query, RecordPool& pool) {
-  MappedFile file(path);
-  if (!file.ok()) {
-    FileRecords unread;
-    unread.openError = file.error();
-    return unread;
-  }
-  return readStatsData(file.data(), file.size(), path, query, pool);
-}
-
-FileRecords readStatsData(const std::uint8_t* data, std::size_t size, const std::string& path, const StoreQuery& query,
-                          RecordPool& pool) {
+// One file's framing pass: every record decoded once, into `decoder`'s
+// values, to check it and to learn its times. Notes are collected, not sent.
+FileRecords frameStatsData(const std::uint8_t* data, std::size_t size, const std::string& path, const StoreQuery& query,
+                           RecordDecoder& decoder) {
   FileRecords result;
-  const RecordPool::Mark fileStart = pool.mark();
   auto drop = [&](const std::string& why) {
-    debugLine(why);
-    pool.rewind(fileStart);
+    result.notes.push_back({true, why});
     result.records.clear();
-    return result;
+    result.storage.kept.clear();
+    return std::move(result);
   };
 
   FrameCursor cursor(data, size);
@@ -137,7 +135,6 @@ FileRecords readStatsData(const std::uint8_t* data, std::size_t size, const std:
   bool reportedUnknownType = false;
   std::uint64_t headerTime = kUnsetTime;
   std::optional<RecordClass> nextClass;
-  std::optional<RecordPool::Mark> afterFirst;
 
   try {
     while (std::optional<std::uint64_t> key = cursor.nextKey()) {
@@ -145,8 +142,8 @@ FileRecords readStatsData(const std::uint8_t* data, std::size_t size, const std:
       if (*key <= kHighestTableKey) {
         nextClass = recordClassForType(type);
         if (!nextClass && !reportedUnknownType) {
-          platform().systemLog(format("Unknown message type 0x%llx in file: %s",
-                                      static_cast<unsigned long long>(*key >> 6), path.c_str()));
+          result.notes.push_back({false, format("Unknown message type 0x%llx in file: %s",
+                                                static_cast<unsigned long long>(*key >> 6), path.c_str())});
           reportedUnknownType = true;
         }
       }
@@ -155,79 +152,98 @@ FileRecords readStatsData(const std::uint8_t* data, std::size_t size, const std:
       if (!body) break;
       if (!nextClass) continue;
 
-      const RecordPool::Mark beforeRecord = pool.mark();
-      Record* record = decodeBody(*nextClass, body->first, body->second, pool);
+      RecordRef ref;
+      std::unique_ptr<Record> header;
+      if (*nextClass == RecordClass::LogStartsV1) {
+        header = decodeHeader(*body);
+        ref = RecordRef(header.get());
+      } else {
+        checkLength(*body);
+        const Record* record = decoder.decode(*nextClass, *body);
+        if (record == nullptr) failToDecode(*nextClass);
+        ref = RecordRef(*nextClass, record->absoluteTime(), record->wallTime(), *body);
+      }
 
       if (type == kLogStartsV1Type) {
-        const LogStartsV1& header = asHeader(record);
-        if (query.onlyBoot && header.bootUUID() != query.onlyBoot) {
+        const auto& h = static_cast<const LogStartsV1&>(*header);
+        if (query.onlyBoot && h.bootUUID() != query.onlyBoot) {
           return drop("Skipping (Boot UUID <" + query.onlyBoot->string() + ">): " + path);
         }
-        if (query.onlySystemVersion &&
-            (!header.hasSystemVersion() || header.systemVersion() != *query.onlySystemVersion)) {
+        if (query.onlySystemVersion && (!h.hasSystemVersion() || h.systemVersion() != *query.onlySystemVersion)) {
           return drop("Skipping (System Version <" + *query.onlySystemVersion + ">): " + path);
         }
         headerTime = kUnsetTime;
       }
       if (type == kLogStartsV0Type) return drop("Skipping (Version 0): " + path);
       if (type != kLogStartsV1Type && expectingHeader) {
-        return drop(std::string("Skipping (Malformed File <") + record->className() + ">): " + path);
+        return drop(std::string("Skipping (Malformed File <") + ref.className() + ">): " + path);
       }
 
-      const std::uint64_t time = record->absoluteTime();
+      const std::uint64_t time = ref.absoluteTime();
       if (headerTime == kUnsetTime) headerTime = time;
       expectingHeader = false;
       if (time >= headerTime) {
-        result.records.push_back(record);
-        if (!afterFirst) afterFirst = pool.mark();
-      } else {
-        pool.rewind(beforeRecord);
+        result.records.push_back(ref);
+        if (header) result.storage.kept.push_back(std::move(header));
       }
     }
   } catch (const DecodeFailure& failure) {
-    platform().systemLog(" ** Caught an exception while reading file: " + path);
-    platform().systemLog(" ** exception: " + failure.description);
-    if (!result.records.empty() && result.records.front()->recordClass() == RecordClass::LogStartsV1) {
-      pool.rewind(*afterFirst);
+    result.notes.push_back({false, " ** Caught an exception while reading file: " + path});
+    result.notes.push_back({false, " ** exception: " + failure.description});
+    if (!result.records.empty() && result.records.front().recordClass() == RecordClass::LogStartsV1) {
       result.records.resize(1);
+      result.storage.kept.resize(1);  // the first kept record is that header
       result.damaged = true;
-      platform().systemLog(" ** All data from boot " + bootOf(result.records.front()).string() + " will be dropped.");
+      result.notes.push_back(
+          {false, " ** All data from boot " + bootOf(result.records.front()).string() + " will be dropped."});
     } else {
       // Nothing was collected yet: the file is dropped without marking a boot.
-      pool.rewind(fileStart);
       result.records.clear();
+      result.storage.kept.clear();
       result.undecodable = true;
     }
   }
   return result;
 }
 
-namespace {
+FileRecords frameStatsFile(const std::string& path, const StoreQuery& query, RecordDecoder& decoder) {
+  auto file = std::make_shared<const MappedFile>(path);
+  if (!file->ok()) {
+    FileRecords unread;
+    unread.openError = file->error();
+    return unread;
+  }
+  FileRecords result = frameStatsData(file->data(), file->size(), path, query, decoder);
+  if (!result.records.empty()) result.storage.files.push_back(std::move(file));
+  return result;
+}
 
 // Collects the files' results under their boots, in reading order.
 class BootGrouper {
  public:
-  RecordPool& pool() { return out_.pool; }
-
   void add(FileRecords file) {
     if (file.records.empty()) return;
-    const Record* first = file.records.front();
+    const RecordRef& first = file.records.front();
     const Uuid boot = bootOf(first);
-    std::vector<Record*>& bootRecords = out_.boots[boot];
-    bootRecords.insert(bootRecords.end(), file.records.begin(), file.records.end());
+    const bool writerFive = asHeader(first).writer() == LogStartsV1::kSingleFileWriter;
+    std::vector<RecordRef>& bootRecords = out_.boots[boot];
+    if (bootRecords.empty()) {
+      bootRecords = std::move(file.records);
+    } else {
+      bootRecords.insert(bootRecords.end(), file.records.begin(), file.records.end());
+    }
+    out_.storage.take(std::move(file.storage));
     if (file.damaged) damaged_.push_back(boot);
-    if (asHeader(first).writer() == LogStartsV1::kSingleFileWriter) {
-      if (!writerFiveSeen_.insert(boot).second) {
-        throw Exception(kInternalInconsistencyException, "duplicate boot uuid detected");
-      }
+    if (writerFive && !writerFiveSeen_.insert(boot).second) {
+      throw Exception(kInternalInconsistencyException, "duplicate boot uuid detected");
     }
   }
 
   // Damaged boots keep only their headers, so the boot sequence stays whole.
   RecordsByBoot finish() {
     for (const Uuid& boot : damaged_) {
-      std::vector<Record*>& records = out_.boots[boot];
-      std::erase_if(records, [](const Record* r) { return r->recordClass() != RecordClass::LogStartsV1; });
+      std::vector<RecordRef>& records = out_.boots[boot];
+      std::erase_if(records, [](const RecordRef& r) { return r.recordClass() != RecordClass::LogStartsV1; });
     }
     return std::move(out_);
   }
@@ -238,13 +254,116 @@ class BootGrouper {
   std::unordered_set<Uuid> writerFiveSeen_;
 };
 
+// Frames files on several threads and hands their results over in order.
+// The calling thread frames files too whenever the next result in order is
+// not ready yet.
+class ParallelFramer {
+ public:
+  ParallelFramer(const std::vector<std::string>& paths, const StoreQuery& query, unsigned threads)
+      : paths_(paths), query_(query), done_(paths.size()), failures_(paths.size()) {
+    for (unsigned i = 1; i < threads; ++i) workers_.emplace_back([this] { work(); });
+  }
+  ~ParallelFramer() {
+    next_.store(paths_.size());  // no new files: stop after the current ones
+    for (std::thread& t : workers_) t.join();
+  }
+
+  // The result of file `index`, files being taken in ascending order.
+  FileRecords take(std::size_t index) {
+    std::unique_lock lock(mutex_);
+    while (!done_[index]) {
+      const std::size_t i = next_.fetch_add(1);
+      if (i < paths_.size()) {
+        lock.unlock();
+        frame(i, ownDecoder_);
+        lock.lock();
+      } else {
+        ready_.wait(lock, [&] { return done_[index].has_value(); });
+      }
+    }
+    if (failures_[index]) std::rethrow_exception(failures_[index]);
+    FileRecords result = std::move(*done_[index]);
+    done_[index].reset();
+    return result;
+  }
+
+ private:
+  void work() {
+    RecordDecoder decoder;
+    for (std::size_t i; (i = next_.fetch_add(1)) < paths_.size();) frame(i, decoder);
+  }
+
+  void frame(std::size_t i, RecordDecoder& decoder) {
+    FileRecords result;
+    std::exception_ptr failure;
+    try {
+      result = frameStatsFile(paths_[i], query_, decoder);
+    } catch (...) {
+      failure = std::current_exception();
+    }
+    {
+      std::lock_guard lock(mutex_);
+      failures_[i] = failure;
+      done_[i] = std::move(result);
+    }
+    ready_.notify_all();
+  }
+
+  const std::vector<std::string>& paths_;
+  const StoreQuery& query_;
+  std::vector<std::optional<FileRecords>> done_;
+  std::atomic<std::size_t> next_{0};
+  std::mutex mutex_;
+  std::condition_variable ready_;
+  std::vector<std::exception_ptr> failures_;
+  RecordDecoder ownDecoder_;
+  std::vector<std::thread> workers_;
+};
+
 }  // namespace
 
-RecordsByBoot readStatsFiles(const std::vector<std::string>& paths, const StoreQuery& query, ReadObserver* observer) {
+void RecordStorage::take(RecordStorage&& other) {
+  files.insert(files.end(), std::make_move_iterator(other.files.begin()), std::make_move_iterator(other.files.end()));
+  kept.insert(kept.end(), std::make_move_iterator(other.kept.begin()), std::make_move_iterator(other.kept.end()));
+  other.files.clear();
+  other.kept.clear();
+}
+
+void emitReadNotes(const FileRecords& file) {
+  for (const ReadNote& note : file.notes) {
+    if (!note.debug) {
+      platform().systemLog(note.text);
+    } else if (gDebug) {
+      err() << note.text << "\n";
+    }
+  }
+}
+
+FileRecords readStatsFile(const std::string& path, const StoreQuery& query) {
+  RecordDecoder decoder;
+  FileRecords result = frameStatsFile(path, query, decoder);
+  emitReadNotes(result);
+  return result;
+}
+
+FileRecords readStatsData(const std::uint8_t* data, std::size_t size, const std::string& name,
+                          const StoreQuery& query) {
+  RecordDecoder decoder;
+  FileRecords result = frameStatsData(data, size, name, query, decoder);
+  emitReadNotes(result);
+  return result;
+}
+
+RecordsByBoot readStatsFiles(const std::vector<std::string>& paths, const StoreQuery& query, ReadObserver* observer,
+                             unsigned threads) {
+  if (threads == 0) threads = std::max(1u, std::thread::hardware_concurrency());
+  threads = static_cast<unsigned>(std::min<std::size_t>(threads, paths.size()));
   BootGrouper grouper;
-  for (const std::string& path : paths) {
-    FileRecords file = readStatsFile(path, query, grouper.pool());
-    if (observer) observer->fileRead(path, file);
+  ParallelFramer framer(paths, query, threads);
+  for (std::size_t i = 0; i < paths.size(); ++i) {
+    FileRecords file = framer.take(i);
+    emitReadNotes(file);
+    if (observer) observer->fileRead(paths[i], file);
     grouper.add(std::move(file));
   }
   return grouper.finish();
@@ -252,8 +371,11 @@ RecordsByBoot readStatsFiles(const std::vector<std::string>& paths, const StoreQ
 
 RecordsByBoot readStatsBuffers(const std::vector<StatsBuffer>& files, const StoreQuery& query) {
   BootGrouper grouper;
+  RecordDecoder decoder;
   for (const StatsBuffer& f : files) {
-    grouper.add(readStatsData(f.data, f.size, f.name, query, grouper.pool()));
+    FileRecords file = frameStatsData(f.data, f.size, f.name, query, decoder);
+    emitReadNotes(file);
+    grouper.add(std::move(file));
   }
   return grouper.finish();
 }

@@ -2,7 +2,7 @@
 
 #include <algorithm>
 
-#include "Records/Record.h"
+#include "Records/RecordDecoder.h"
 #include "base/Exception.h"
 #include "time/BootTimeline.h"
 
@@ -12,12 +12,12 @@ AbsoluteTimeline::AbsoluteTimeline(const BootTimeline* boot) : boot_(boot) {
   if (boot != nullptr) bootUuid_ = boot->uuid();
 }
 
-void AbsoluteTimeline::addObject(const Record* record) {
-  const std::uint64_t time = record->absoluteTime();
-  if (!records_.empty() && time < records_.back()->absoluteTime()) ascending_ = false;
+void AbsoluteTimeline::addObject(const RecordRef& record) {
+  const std::uint64_t time = record.absoluteTime();
+  if (!records_.empty() && time < records_.back().absoluteTime()) ascending_ = false;
   startAbsoluteTime_ = std::min(startAbsoluteTime_, time);
   endAbsoluteTime_ = std::max(endAbsoluteTime_, time);
-  if (std::uint64_t wall = record->wallTime(); wall != 0) {
+  if (std::uint64_t wall = record.wallTime(); wall != 0) {
     if (skew_ != 0 && std::int64_t(wall - time) != skew_) {
       throw Exception(kInternalInconsistencyException, "event skew mismatch");
     }
@@ -35,10 +35,11 @@ void AbsoluteTimeline::adjustSkew(std::int64_t delta) {
 bool AbsoluteTimeline::enumerateEventsWithOffset(std::uint64_t offset, const EventBlock& block) const {
   AbsTime point{bootUuid_, 0};
   bool stop = false;
-  for (const Record* record : records_) {
-    const std::uint64_t time = record->absoluteTime();
+  WalkDecoder decode;
+  for (const RecordRef& record : records_) {
+    const std::uint64_t time = record.absoluteTime();
     point._setTime(time);
-    block(*record, offset + (time - startAbsoluteTime_), std::uint64_t(skew_) + time, point, stop);
+    block(decode(record), offset + (time - startAbsoluteTime_), std::uint64_t(skew_) + time, point, stop);
     if (stop) return true;
   }
   return false;
@@ -54,14 +55,14 @@ bool AbsoluteTimeline::enumerateEventsInRelativeRanges(const std::vector<Range>&
     // Records before the first range are called for nothing and end nothing.
     const std::uint64_t firstTime = startAbsoluteTime_ + (ranges.front().location - offset);
     it = std::partition_point(records_.begin(), records_.end(),
-                              [&](const Record* r) { return r->absoluteTime() < firstTime; });
+                              [&](const RecordRef& r) { return r.absoluteTime() < firstTime; });
   }
   AbsTime point{bootUuid_, 0};
+  WalkDecoder decode;
   auto cursor = ranges.begin();
   std::uint64_t previous = 0;
   for (; it != records_.end(); ++it) {
-    const Record* record = *it;
-    const std::uint64_t time = record->absoluteTime();
+    const std::uint64_t time = it->absoluteTime();
     const std::uint64_t position = offset + (time - startAbsoluteTime_);
     if (position > lastEnd) return true;
     if (position < previous) cursor = ranges.begin();
@@ -71,7 +72,7 @@ bool AbsoluteTimeline::enumerateEventsInRelativeRanges(const std::vector<Range>&
     if (cursor == ranges.end() || cursor->location > position) continue;
     point._setTime(time);
     bool ignored = false;
-    block(*record, position, std::uint64_t(skew_) + time, point, ignored);
+    block(decode(*it), position, std::uint64_t(skew_) + time, point, ignored);
   }
   return false;
 }

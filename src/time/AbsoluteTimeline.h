@@ -1,14 +1,16 @@
 #pragma once
 // One segment: a run of records within one boot whose skew (wall time minus
 // absolute time) is constant, so positions, wall times and absolute times
-// convert by plain addition. Segments hold non-owning pointers to records
-// owned elsewhere, in the order added.
+// convert by plain addition. Segments hold handles on records kept
+// elsewhere, in the order added; a walk decodes each record as it reaches it,
+// and the record it hands to the block is valid only during that call.
 //
 // A record at absolute time t of a segment placed at offset X has the
 // position X + (t - startAbsoluteTime) and the wall time skew + t.
 #include <cstdint>
 #include <vector>
 
+#include "Records/RecordRef.h"
 #include "time/Timeline.h"
 
 namespace bw {
@@ -24,9 +26,9 @@ class AbsoluteTimeline : public Timeline {
   // Widens the absolute span to the record's time; a record with a wall
   // time sets the skew (from the segment's lowest absolute time) or must
   // match it, else throws kInternalInconsistencyException "event skew
-  // mismatch". The record is not owned.
-  void addObject(const Record* record);
-  const std::vector<const Record*>& records() const { return records_; }
+  // mismatch".
+  void addObject(const RecordRef& record);
+  const std::vector<RecordRef>& records() const { return records_; }
 
   // Adds `delta` to the skew (the boot moves early segments onto the clock).
   void adjustSkew(std::int64_t delta);
@@ -65,7 +67,7 @@ class AbsoluteTimeline : public Timeline {
  private:
   const BootTimeline* boot_;
   Uuid bootUuid_;
-  std::vector<const Record*> records_;
+  std::vector<RecordRef> records_;
   std::uint64_t startAbsoluteTime_ = UINT64_MAX;
   std::uint64_t endAbsoluteTime_ = 0;
   std::int64_t skew_ = 0;

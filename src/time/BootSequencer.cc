@@ -78,15 +78,10 @@ std::unique_ptr<Timeline> keptChain(std::vector<std::unique_ptr<BootTimeline>>& 
 
 }  // namespace
 
-void sortByAbsoluteTime(std::vector<Record*>& records) {
-  auto earlier = [](const Record* a, const Record* b) { return a->absoluteTime() < b->absoluteTime(); };
+void sortByAbsoluteTime(std::vector<RecordRef>& records) {
+  auto earlier = [](const RecordRef& a, const RecordRef& b) { return a.absoluteTime() < b.absoluteTime(); };
   if (std::is_sorted(records.begin(), records.end(), earlier)) return;
-  // Sort (time, record) pairs so that the comparisons read no record.
-  std::vector<std::pair<std::uint64_t, Record*>> keyed;
-  keyed.reserve(records.size());
-  for (Record* r : records) keyed.emplace_back(r->absoluteTime(), r);
-  std::stable_sort(keyed.begin(), keyed.end(), [](const auto& a, const auto& b) { return a.first < b.first; });
-  for (std::size_t i = 0; i < records.size(); ++i) records[i] = keyed[i].second;
+  std::stable_sort(records.begin(), records.end(), earlier);
 }
 
 std::map<std::string, std::unique_ptr<Timeline>> sequenceBoots(BootRecords& bootRecords) {
@@ -98,16 +93,18 @@ std::map<std::string, std::unique_ptr<Timeline>> sequenceBoots(BootRecords& boot
 
   std::map<std::string, std::vector<std::unique_ptr<BootTimeline>>> bootsByVersion;
   for (const Uuid* uuid : uuids) {
-    std::vector<Record*>& records = bootRecords.at(*uuid);
+    std::vector<RecordRef>& records = bootRecords.at(*uuid);
     sortByAbsoluteTime(records);
     std::optional<Uuid> lastUUID;
     std::string version = "<unknown>";
-    if (!records.empty() && records.front()->recordClass() == RecordClass::LogStartsV1) {
-      const auto& header = static_cast<const LogStartsV1&>(*records.front());
+    if (!records.empty() && records.front().recordClass() == RecordClass::LogStartsV1 && records.front().decoded()) {
+      const auto& header = static_cast<const LogStartsV1&>(*records.front().decoded());
       lastUUID = header.lastBootUUID();
       if (header.hasSystemVersion()) version = header.systemVersion();
     }
     bootsByVersion[version].push_back(std::make_unique<BootTimeline>(*uuid, lastUUID, records));
+    // The segments hold their own handles now.
+    std::vector<RecordRef>().swap(records);
   }
 
   std::map<std::string, std::unique_ptr<Timeline>> result;

@@ -14,17 +14,18 @@
 #include <unordered_map>
 #include <vector>
 
+#include "Records/RecordRef.h"
 #include "base/Uuid.h"
 #include "time/Timeline.h"
 
 namespace bw {
 
-// The record reader's result: each boot's records as non-owning pointers
-// (the records live in the reader's pool until the models are built).
-using BootRecords = std::unordered_map<Uuid, std::vector<Record*>>;
+// The record reader's result: each boot's record handles (the records stay
+// where the reader keeps them for as long as the models live).
+using BootRecords = std::unordered_map<Uuid, std::vector<RecordRef>>;
 
-// Sorts each boot's records by absolute time in place (ties keep their
-// order), builds its BootTimeline and returns the kept chain of each system
+// Sorts each boot's records by absolute time (ties keep their order), builds
+// its BootTimeline (handing over and emptying the boot's list) and returns the kept chain of each system
 // version (a boot's first record without one files it under "<unknown>").
 // Throws "invalid event stream detected" for a boot whose first record is
 // not a LogStartsV1, and kInternalInconsistencyException "boot uuid cycle
@@ -32,6 +33,6 @@ using BootRecords = std::unordered_map<Uuid, std::vector<Record*>>;
 std::map<std::string, std::unique_ptr<Timeline>> sequenceBoots(BootRecords& bootRecords);
 
 // Sorts records by absolute time; records with equal times keep their order.
-void sortByAbsoluteTime(std::vector<Record*>& records);
+void sortByAbsoluteTime(std::vector<RecordRef>& records);
 
 }  // namespace bw

@@ -6,24 +6,24 @@
 
 namespace bw {
 
-BootTimeline::BootTimeline(const Uuid& uuid, std::optional<Uuid> lastUUID, std::span<Record* const> events)
+BootTimeline::BootTimeline(const Uuid& uuid, std::optional<Uuid> lastUUID, std::span<const RecordRef> events)
     : uuid_(uuid), lastUUID_(lastUUID) {
-  if (events.empty() || events.front()->recordClass() != RecordClass::LogStartsV1) {
+  if (events.empty() || events.front().recordClass() != RecordClass::LogStartsV1 || !events.front().decoded()) {
     throw Exception(kInvalidArgumentException, "invalid event stream detected");
   }
-  const auto& header = static_cast<const LogStartsV1&>(*events.front());
+  const auto& header = static_cast<const LogStartsV1&>(*events.front().decoded());
   if (header.hasSystemVersion()) systemVersion_ = header.systemVersion();
 
   AbsoluteTimeline* current = nullptr;
   bool clockFixed = false;
-  for (const Record* event : events) {
-    const std::uint64_t wall = event->wallTime();
+  for (const RecordRef& event : events) {
+    const std::uint64_t wall = event.wallTime();
     if (wall == 0) {
       if (current == nullptr) current = &newSegment();
       current->addObject(event);
       continue;
     }
-    const std::int64_t skew = std::int64_t(wall - event->absoluteTime());
+    const std::int64_t skew = std::int64_t(wall - event.absoluteTime());
     const std::int64_t currentSkew = current != nullptr ? current->skew() : 0;
     if (!clockFixed && wall > kClockSetWallTime) {
       // Everything so far ran on an unset clock: move it onto this reading.

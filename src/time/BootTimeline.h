@@ -6,12 +6,14 @@
 // plausible clock reading of the boot.
 //
 // The boot's first record must be a LogStartsV1; it names the system
-// version. Records are not owned and must outlive the timeline.
+// version. The records behind the handles must outlive the timeline.
 #include <cstdint>
 #include <optional>
 #include <span>
 #include <string>
+#include <vector>
 
+#include "Records/RecordRef.h"
 #include "base/Uuid.h"
 #include "time/Timeline.h"
 
@@ -27,8 +29,12 @@ class BootTimeline : public Timeline {
 
   // Builds the boot from `events`, sorted by absolute time. Throws
   // kInvalidArgumentException "invalid event stream detected" unless the
-  // first record is exactly a LogStartsV1.
-  BootTimeline(const Uuid& uuid, std::optional<Uuid> lastUUID, std::span<Record* const> events);
+  // first record is exactly a LogStartsV1 kept decoded.
+  BootTimeline(const Uuid& uuid, std::optional<Uuid> lastUUID, std::span<const RecordRef> events);
+  BootTimeline(const Uuid& uuid, std::span<const RecordRef> events) : BootTimeline(uuid, std::nullopt, events) {}
+  // The same over records kept decoded, which must outlive the timeline.
+  BootTimeline(const Uuid& uuid, std::optional<Uuid> lastUUID, std::span<Record* const> events)
+      : BootTimeline(uuid, lastUUID, std::vector<RecordRef>(events.begin(), events.end())) {}
   BootTimeline(const Uuid& uuid, std::span<Record* const> events) : BootTimeline(uuid, std::nullopt, events) {}
 
   const Uuid& uuid() const { return uuid_; }

@@ -7,7 +7,8 @@
 // reader must never crash or throw (except "duplicate boot uuid detected" for
 // two writer-5 files), and these must hold:
 //   - every boot's records begin with a LogStartsV1 header of that boot;
-//   - a single file leaves exactly its kept records in the pool;
+//   - a single file's storage keeps decoded exactly the headers it kept;
+//   - every kept record decodes again, with the times its handle has;
 //   - the same file twice gives every boot twice its records, and throws
 //     exactly when the first header was written by writer 5;
 //   - the filters drop the file whole or keep it exactly as before;
@@ -22,6 +23,7 @@
 #include <vector>
 
 #include "Records/LogStartsV1.h"
+#include "Records/RecordDecoder.h"
 #include "Records/RecordFactory.h"
 #include "base/Console.h"
 #include "base/Exception.h"
@@ -82,10 +84,19 @@ inline std::size_t countRecords(const RecordsByBoot& r) {
   return n;
 }
 
+// Records kept decoded: the headers, which the storage must hold, no more.
+inline std::size_t keptDecoded(const RecordsByBoot& r) {
+  std::size_t n = 0;
+  for (const auto& [boot, records] : r.boots) {
+    for (const RecordRef& ref : records) n += ref.decoded() != nullptr;
+  }
+  return n;
+}
+
 inline std::string shapeProblem(const RecordsByBoot& r) {
   for (const auto& [boot, records] : r.boots) {
     if (records.empty()) return "a boot without records";
-    const LogStartsV1* header = recordCast<LogStartsV1>(records.front());
+    const LogStartsV1* header = recordCast<LogStartsV1>(records.front().decoded());
     if (header == nullptr) return "a boot whose first record is not a header";
     if (header->bootUUID().value_or(Uuid()) != boot) return "records filed under another boot";
   }
@@ -113,16 +124,19 @@ inline std::string checkStatsInput(const std::uint8_t* data, std::size_t size) {
   RecordsByBoot once = readStatsBuffers({file}, plain);
   if (std::string p = detail::shapeProblem(once); !p.empty()) return p;
   if (once.boots.size() > 1) return "one file filed under two boots";
-  if (detail::countRecords(once) != once.pool.recordCount()) return "the pool keeps records the file dropped";
+  if (detail::keptDecoded(once) != once.storage.kept.size()) return "the storage keeps records the file dropped";
   if (once.boots.empty()) return {};
 
   const auto& [boot, records] = *once.boots.begin();
-  for (const Record* r : records) {
-    r->prettyPrint();
-    if (std::string p = detail::reencodeProblem(*r); !p.empty()) return p;
+  RecordDecoder decoder;
+  for (const RecordRef& ref : records) {
+    const Record& r = decoder.record(ref);
+    if (r.absoluteTime() != ref.absoluteTime() || r.wallTime() != ref.wallTime()) return "a handle's times differ";
+    r.prettyPrint();
+    if (std::string p = detail::reencodeProblem(r); !p.empty()) return p;
   }
 
-  const LogStartsV1& header = *recordCast<LogStartsV1>(records.front());
+  const LogStartsV1& header = *recordCast<LogStartsV1>(records.front().decoded());
   try {
     RecordsByBoot twice = readStatsBuffers({file, file}, plain);
     if (header.writer() == 5) return "two writer-5 files of one boot were accepted";

@@ -43,7 +43,7 @@ struct Read {
     result = readStatsBuffers({StatsBuffer{bytesOf(bytes), bytes.size(), name}}, StoreQuery());
     setPlatform(nullptr);
   }
-  const std::vector<Record*>& onlyBoot() const { return result.boots.begin()->second; }
+  const std::vector<RecordRef>& onlyBoot() const { return result.boots.begin()->second; }
 
   std::string bytes;
   fuzz::QuietPlatform log;
@@ -77,10 +77,10 @@ TEST(FuzzCorpus, EachTypeSeedReadsAsAHeaderAndRecordsOfItsType) {
     ++seeds;
     Read read(name);
     ASSERT_EQ(read.result.boots.size(), 1u);
-    const std::vector<Record*>& records = read.onlyBoot();
+    const std::vector<RecordRef>& records = read.onlyBoot();
     ASSERT_GE(records.size(), 2u);
-    EXPECT_EQ(records.front()->recordClass(), RecordClass::LogStartsV1);
-    for (std::size_t i = 1; i < records.size(); ++i) EXPECT_EQ(records[i]->recordClass(), *c);
+    EXPECT_EQ(records.front().recordClass(), RecordClass::LogStartsV1);
+    for (std::size_t i = 1; i < records.size(); ++i) EXPECT_EQ(records[i].recordClass(), *c);
     EXPECT_EQ(read.log.systemLogLines, 0u);
   }
   EXPECT_GE(seeds, 19);  // every type with a class but the two headers
@@ -111,9 +111,9 @@ TEST(FuzzCorpus, DamagedSeedsAreReadAsTheReaderPromises) {
   {
     Read above("above-the-table");  // keys above the table reuse the class before
     ASSERT_EQ(above.result.boots.size(), 1u);
-    const std::vector<Record*>& records = above.onlyBoot();
+    const std::vector<RecordRef>& records = above.onlyBoot();
     ASSERT_EQ(records.size(), 4u);
-    for (std::size_t i = 1; i < records.size(); ++i) EXPECT_EQ(records[i]->recordClass(), RecordClass::SleepWake);
+    for (std::size_t i = 1; i < records.size(); ++i) EXPECT_EQ(records[i].recordClass(), RecordClass::SleepWake);
   }
 }
 

@@ -27,7 +27,7 @@ class ModelProcesses : public ::testing::Test {
              Sample{.uniqueid = 10, .at = 3000, .status = 0, .name = "App", .responsible = 10, .cpuMs = 30},
          })
       usages.push_back(test::processUsage(s));
-    std::vector<Record*> records{&header};
+    std::vector<RecordRef> records{&header};
     for (ProcessUsage& u : usages) records.push_back(&u);
     std::vector<std::unique_ptr<Timeline>> boots;
     boots.push_back(std::make_unique<BootTimeline>(test::boot(1), records));

@@ -50,8 +50,7 @@ FileCheck check(const std::string& path, const std::string& scratch) {
   const auto trimmed = recorder::trimTornTail(scratch);
   c.wholeRecords = trimmed.records;
   c.tornBytes = trimmed.trimmedBytes;
-  RecordPool pool;
-  const FileRecords read = readStatsFile(path, StoreQuery{}, pool);
+  const FileRecords read = readStatsFile(path, StoreQuery{});
   c.readerKeepsAllWhole = !read.damaged && read.records.size() == trimmed.records;
   return c;
 }
@@ -109,8 +108,7 @@ TEST(RecorderCrash, SigkillWhileWritingLosesAtMostTheLastRecord) {
   std::uint64_t files = 0, records = 0, emptyFiles = 0;
   for (const auto& [path, count] : whole) {
     SCOPED_TRACE(path);
-    RecordPool pool;
-    const FileRecords read = readStatsFile(path, StoreQuery{}, pool);
+    const FileRecords read = readStatsFile(path, StoreQuery{});
     EXPECT_FALSE(read.damaged);
     EXPECT_EQ(read.records.size(), count);  // every whole record survived its repair
     const auto trimmed = recorder::trimTornTail(path);

@@ -9,9 +9,10 @@
 #include <string>
 #include <vector>
 
-#include "store/StoreQuery.h"
+#include "Records/RecordDecoder.h"
 #include "recorder/Clock.h"
 #include "store/RecordReader.h"
+#include "store/StoreQuery.h"
 #include "support/TempDir.h"
 
 namespace bw::test {
@@ -47,7 +48,7 @@ struct MachineTree {
 // Every record of every stats file in `directory`, files in name order; each
 // file must read without damage.
 struct StoreContents {
-  RecordPool pool;
+  std::vector<std::unique_ptr<Record>> owned;
   std::vector<const Record*> records;
   std::size_t files = 0;
 
@@ -59,10 +60,10 @@ struct StoreContents {
     std::sort(paths.begin(), paths.end());
     StoreQuery query;
     for (const auto& p : paths) {
-      const FileRecords file = readStatsFile(p, query, pool);
+      const FileRecords file = readStatsFile(p, query);
       EXPECT_FALSE(file.damaged) << p;
       EXPECT_FALSE(file.records.empty()) << p;
-      records.insert(records.end(), file.records.begin(), file.records.end());
+      for (const RecordRef& r : file.records) records.push_back(owned.emplace_back(copyRecord(r)).get());
       ++files;
     }
   }

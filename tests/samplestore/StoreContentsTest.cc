@@ -17,6 +17,7 @@
 #include "Records/DeviceChange.h"
 #include "Records/LogStartsV1.h"
 #include "Records/PowerStateChange.h"
+#include "Records/RecordDecoder.h"
 #include "Records/SleepWake.h"
 #include "Records/TimeChange.h"
 #include "Records/UserIdle.h"
@@ -39,7 +40,8 @@ struct SharedStore {
   StoreConfig config;
   StoreReport report;
   RecordsByBoot read;
-  std::vector<std::vector<Record*>> boots;  // per boot, sorted by absolute time, in the order written
+  std::vector<std::unique_ptr<Record>> owned;
+  std::vector<std::vector<Record*>> boots;  // per boot, decoded, sorted by absolute time, in the order written
 };
 
 const SharedStore& sharedStore() {
@@ -50,8 +52,10 @@ const SharedStore& sharedStore() {
     s->report = generateSampleStore(s->config);
     s->read = readAllRecords(StoreQuery{.fromPath = s->config.output});
     for (const BootSummary& boot : s->report.boots) {
-      s->boots.push_back(s->read.boots[boot.uuid]);
-      sortByAbsoluteTime(s->boots.back());
+      std::vector<RecordRef> refs = s->read.boots[boot.uuid];
+      sortByAbsoluteTime(refs);
+      auto& records = s->boots.emplace_back();
+      for (const RecordRef& r : refs) records.push_back(s->owned.emplace_back(copyRecord(r)).get());
     }
     return s;
   }();
@@ -62,7 +66,7 @@ TEST(SampleStoreContents, ReaderFindsEveryRecordTheGeneratorReportsPerClass) {
   const auto& store = sharedStore();
   ClassCounts read{};
   for (const auto& [uuid, records] : store.read.boots) {
-    for (const Record* r : records) ++read[static_cast<std::size_t>(r->recordClass())];
+    for (const RecordRef& r : records) ++read[static_cast<std::size_t>(r.recordClass())];
   }
   for (int k = 0; k < kRecordClassCount; ++k) {
     EXPECT_EQ(read[static_cast<std::size_t>(k)], store.report.records[static_cast<std::size_t>(k)])

@@ -1,8 +1,13 @@
 #include <gtest/gtest.h>
 
+#include <map>
 #include <sstream>
+#include <tuple>
 
 #include "Records/LogStartsV0.h"
+#include "Records/RecordDecoder.h"
+#include "Records/SleepWake.h"
+#include "Records/UserIdle.h"
 #include "base/Console.h"
 #include "base/Exception.h"
 #include "store/RecordReader.h"
@@ -42,9 +47,9 @@ class RecordReader : public ::testing::Test {
   std::ostringstream out_, err_;
 };
 
-std::vector<std::uint64_t> times(const std::vector<Record*>& records) {
+std::vector<std::uint64_t> times(const std::vector<RecordRef>& records) {
   std::vector<std::uint64_t> t;
-  for (const Record* r : records) t.push_back(r->absoluteTime());
+  for (const RecordRef& r : records) t.push_back(r.absoluteTime());
   return t;
 }
 
@@ -80,7 +85,7 @@ TEST_F(RecordReader, VersionZeroAnywhereDropsTheWholeFile) {
   RecordsByBoot r = read({path});
   EXPECT_TRUE(r.boots.empty());
   EXPECT_EQ(debugText(), "Skipping (Version 0): " + path + "\n");
-  EXPECT_EQ(r.pool.recordCount(), 0u);
+  EXPECT_TRUE(r.storage.kept.empty() && r.storage.files.empty());
 }
 
 TEST_F(RecordReader, AFileNotStartingWithAHeaderIsDropped) {
@@ -183,6 +188,61 @@ TEST_F(RecordReader, FilesOfOneBootAppendInTheOrderGiven) {
   b.append(idle(200));
   RecordsByBoot r = read({write("a.stats", a), write("b.stats", b)});
   EXPECT_EQ(times(r.boots[bootNamed(1)]), (std::vector<std::uint64_t>{500, 600, 100, 200}));
+}
+
+// Records stay in the file: only headers are kept decoded, and each handle
+// decodes to what was written, fields absent in it absent again (the decoder
+// reuses one value per class).
+TEST_F(RecordReader, HandlesDecodeToWhatWasWrittenWithOnlyHeadersKeptDecoded) {
+  StatsFileWriter w;
+  w.append(header(bootNamed(1), 100));
+  w.append(test::sleepWake(200, test::kWallBase + 200, SleepWake::kWake, "Lid"));
+  w.append(sleepAt(300));
+  w.append(idle(400));
+  RecordsByBoot r = read({write("a.stats", w)});
+  const std::vector<RecordRef>& records = r.boots[bootNamed(1)];
+  ASSERT_EQ(records.size(), 4u);
+  EXPECT_EQ(r.storage.kept.size(), 1u);
+  EXPECT_EQ(r.storage.files.size(), 1u);
+  EXPECT_NE(records[0].decoded(), nullptr);
+  EXPECT_EQ(records[1].decoded(), nullptr);
+  EXPECT_EQ(std::tuple(records[2].wallTime(), records[3].wallTime()), std::tuple(test::kWallBase + 300, 0ull));
+  RecordDecoder decoder;
+  const auto& wake = static_cast<const SleepWake&>(decoder.record(records[1]));
+  EXPECT_EQ(std::tuple(wake.reason(), wake.wakeType()), std::tuple(SleepWake::kWake, std::string("Lid")));
+  const auto& sleep = static_cast<const SleepWake&>(decoder.record(records[2]));
+  EXPECT_EQ(&sleep, &wake);  // one value per class, reused
+  EXPECT_EQ(std::tuple(sleep.reason(), sleep.hasWakeType(), sleep.wakeType(), sleep.absoluteTime()),
+            std::tuple(SleepWake::kSleep, false, std::string(), 300ull));
+}
+
+// Framing on several threads hands files over in the order given: the same
+// boots, records and messages, in the same order, as one thread.
+TEST_F(RecordReader, ThreadsChangeNothingButTheSpeed) {
+  std::vector<std::string> paths;
+  for (int i = 0; i < 24; ++i) {
+    StatsFileWriter w;
+    w.append(header(bootNamed(1 + i % 3), 1000 * i));
+    for (int k = 1; k <= i; ++k) w.append(idle(1000 * i + k));
+    if (i % 5 == 1) w.append(idle(1000 * i + 999), 5);            // an unknown type: one log line
+    if (i % 7 == 3) w.appendRaw(std::string("\x5a\x10\x08", 3));  // damaged: its boot keeps headers only
+    paths.push_back(write("f" + std::to_string(i) + ".stats", w));
+  }
+  StatsFileWriter v0;
+  v0.append(idle(5));
+  paths.insert(paths.begin() + 7, write("malformed.stats", v0));
+  auto outcome = [&](unsigned threads) {
+    fake.systemLogLines.clear();
+    err_.str("");
+    RecordsByBoot r = readStatsFiles(paths, query, nullptr, threads);
+    std::map<Uuid, std::vector<std::uint64_t>> byBoot;
+    for (const auto& [boot, records] : r.boots) byBoot[boot] = times(records);
+    return std::tuple(byBoot, fake.systemLogLines, debugText());
+  };
+  const auto one = outcome(1);
+  EXPECT_EQ(std::get<1>(one).size(), 5u + 3u * 3u);  // five unknown-type lines, three damaged files
+  EXPECT_NE(std::get<2>(one), "");
+  for (unsigned threads : {2u, 4u, 8u}) EXPECT_EQ(outcome(threads), one) << threads << " threads";
 }
 
 }  // namespace

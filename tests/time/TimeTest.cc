@@ -286,8 +286,8 @@ void literalRangeWalk(const Timeline& t, const std::vector<Range>& ranges, std::
     for (auto [child, x] : literalChildren(t, offset)) literalRangeWalk(*child, ranges, x, positions);
     return;
   }
-  for (const Record* r : s->records()) {
-    const std::uint64_t p = offset + (r->absoluteTime() - s->startAbsoluteTime());
+  for (const RecordRef& r : s->records()) {
+    const std::uint64_t p = offset + (r.absoluteTime() - s->startAbsoluteTime());
     if (p > (ranges.empty() ? 0 : ranges.back().end())) return;
     if (std::any_of(ranges.begin(), ranges.end(), [p](const Range& range) { return range.contains(p); }))
       positions.push_back(p);
@@ -456,9 +456,11 @@ TEST_F(TimeTest, ABootIsSortedByAbsoluteTimeKeepingTiesInOrderAndBeginsWithAVers
   EXPECT_EQ(std::tuple(named.uuid(), *named.lastUUID(), *named.systemVersion()), std::tuple(kA, kB, "23A344"));
   EXPECT_FALSE(unnamed.lastUUID().has_value() || unnamed.systemVersion().has_value());
   Record *last = idle(500), *early = idle(300), *late = idle(300), *first = header(0, kWall);
-  boots_[kA] = {last, early, first, late};
-  sequenceBoots(boots_);
-  EXPECT_EQ(boots_[kA], (Records{first, early, late, last}));
+  std::vector<RecordRef> refs{last, early, first, late};
+  sortByAbsoluteTime(refs);
+  std::vector<const Record*> order;
+  for (const RecordRef& r : refs) order.push_back(r.decoded());
+  EXPECT_EQ(order, (std::vector<const Record*>{first, early, late, last}));
 }
 
 // A run of boots with sleeps, a clock set back, a clock set late and a boot that cannot
@@ -482,7 +484,7 @@ TEST_F(TimeTest, EveryRecordsPositionMapsBackToItsWallTimeAndAbsoluteTime) {
   boots_[kD] = {header(0, kWall - 100000), idle(10)};
   std::map<const Record*, Uuid> bootOf;
   for (const auto& [id, records] : boots_)
-    for (const Record* r : records) bootOf[r] = id;
+    for (const RecordRef& r : records) bootOf[r.decoded()] = id;
   auto timelines = sequenceBoots(boots_);
   EXPECT_EQ(out_.str(), warning({kD}));
   const Timeline& timeline = *timelines.at("23A344");
