@@ -2,6 +2,7 @@
 // The common base of the record message classes. Each record knows its
 // class (a tag, cheaper than dynamic_cast in hot loops), its absolute time,
 // and whether it carries a wall time of its own.
+#include <bitset>
 #include <cstddef>
 #include <cstdint>
 #include <memory>
@@ -28,6 +29,15 @@ enum class RecordClass : std::uint8_t {
 #define BW_RECORD_COUNT(name, ...) +1
 inline constexpr int kRecordClassCount = 0 BW_RECORD_CLASSES(BW_RECORD_COUNT);
 #undef BW_RECORD_COUNT
+
+// A set of record classes, indexed by tag.
+using RecordClassSet = std::bitset<kRecordClassCount>;
+inline RecordClassSet allRecordClasses() { return RecordClassSet().set(); }
+inline RecordClassSet recordClasses(std::initializer_list<RecordClass> classes) {
+  RecordClassSet set;
+  for (RecordClass c : classes) set.set(static_cast<std::size_t>(c));
+  return set;
+}
 
 // The class's name as printed ("SleepWake", "LogStartsV1", ...).
 const char* recordClassName(RecordClass c);

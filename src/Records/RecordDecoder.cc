@@ -53,6 +53,21 @@ WalkDecoder::WalkDecoder() {
 
 WalkDecoder::~WalkDecoder() { --tWalks.depth; }
 
+std::uint64_t wallTimeOf(const RecordRef& ref, RecordDecoder& decoder) {
+  if (const Record* kept = ref.decoded()) return kept->wallTime();
+  if (!blankRecord(ref.recordClass()).answersWallTime()) return 0;
+  return decoder.record(ref).wallTime();
+}
+
+const Record& blankRecord(RecordClass c) {
+  static const auto blanks = [] {
+    std::array<std::unique_ptr<Record>, kRecordClassCount> made;
+    for (std::size_t i = 0; i < made.size(); ++i) made[i] = makeRecord(static_cast<RecordClass>(i));
+    return made;
+  }();
+  return *blanks[static_cast<std::size_t>(c)];
+}
+
 std::unique_ptr<Record> copyRecord(const RecordRef& ref) {
   RecordDecoder decoder;
   return decoder.record(ref).copy();

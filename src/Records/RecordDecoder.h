@@ -49,6 +49,14 @@ class WalkDecoder {
   RecordDecoder* decoder_;
 };
 
+// The record's own wall time (0 for none): read from the record for the few
+// classes that have one, decoding it with `decoder` when it is encoded.
+std::uint64_t wallTimeOf(const RecordRef& ref, RecordDecoder& decoder);
+
+// An empty record of class `c`: what a reader that looks at no field of the
+// class may be given instead of the decoded record.
+const Record& blankRecord(RecordClass c);
+
 // A decoded copy of the record behind `ref`, owned by the caller.
 std::unique_ptr<Record> copyRecord(const RecordRef& ref);
 

@@ -24,6 +24,7 @@ class DateDomain : public WallTimeDomain {
   explicit DateDomain(const YearMonthDay& components);
 
   void addEvent(const Record& event, std::uint64_t position, const AbsTime& absTime, std::uint64_t wallTime) override;
+  RecordClassSet classesRead() const override { return recordClasses({RecordClass::TimeChange}); }
 
   YearMonthDay components() const { return components_; }
   // The zone in force, by its full name; none until a known abbreviation.

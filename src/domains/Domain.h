@@ -23,6 +23,9 @@ class Domain : public Summarizer {
   void addEvent(const Record& event, std::uint64_t position, const AbsTime& absTime,
                 std::uint64_t wallTime) override = 0;
 
+  // Domains go by positions and times; those that read a record say so.
+  RecordClassSet classesRead() const override { return {}; }
+
   // Reports whether the record at `position` is inside: a change opens or
   // closes a range there; no change does nothing.
   void setDomain(bool inside, std::uint64_t position);

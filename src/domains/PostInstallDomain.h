@@ -18,6 +18,7 @@ class PostInstallDomain : public Domain {
   PostInstallDomain() = default;
 
   void addEvent(const Record& event, std::uint64_t position, const AbsTime& absTime, std::uint64_t wallTime) override;
+  RecordClassSet classesRead() const override { return recordClasses({RecordClass::LogStartsV1}); }
 
   // Where the update's first hour began; none until then.
   const std::optional<AbsTime>& startAbsTime() const { return startAbsTime_; }

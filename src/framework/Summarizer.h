@@ -44,6 +44,10 @@ class Summarizer {
   // Feeds one record: boot-change handling, end at sleep, acceptance by
   // class, then the handler's answer.
   virtual void addEvent(const Record& event, std::uint64_t position, const AbsTime& absTime, std::uint64_t wallTime);
+  // The classes whose fields addEvent reads. A record of any other class may
+  // come as an empty record of its class (class, position and times exact),
+  // which spares decoding records that nobody reads.
+  virtual RecordClassSet classesRead() const { return allRecordClasses(); }
   // Opens a range at `position` unless one is open.
   void beginRangeAtPosition(std::uint64_t position);
   // Records the open range up to `position`; an empty or backwards range is

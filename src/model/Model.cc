@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "Records/RecordDecoder.h"
 #include "base/Exception.h"
 #include "base/RangeList.h"
 #include "store/RecordReader.h"
@@ -28,9 +29,14 @@ void Model::processEventsWithDomains(const std::vector<Summarizer*>& domains, bo
   const std::size_t summarizerCount = all.size();
   all.insert(all.end(), domains.begin(), domains.end());
 
+  RecordClassSet read;
+  for (Summarizer* s : all) read |= s->classesRead();
   std::uint64_t last = 0;
-  timeline_->enumerateEventsUsingBlock(
-      [&](const Record& event, std::uint64_t position, std::uint64_t wallTime, const AbsTime& absTime, bool&) {
+  WalkDecoder decode;
+  timeline_->enumerateRecordsUsingBlock(
+      [&](const RecordRef& record, std::uint64_t position, std::uint64_t wallTime, const AbsTime& absTime, bool&) {
+        const RecordClass c = record.recordClass();
+        const Record& event = read.test(static_cast<std::size_t>(c)) ? decode(record) : blankRecord(c);
         for (Summarizer* s : all) s->addEvent(event, position, absTime, wallTime);
         last = position;
       });

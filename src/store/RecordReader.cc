@@ -52,17 +52,25 @@ class FrameCursor {
     return static_cast<std::uint64_t>(static_cast<std::int64_t>(static_cast<std::int32_t>(key)));
   }
 
-  // The next body's bytes; none at the end of the data. A length running
-  // past the end is a decoding failure when the body has a class, and the
-  // end of the data when it has none.
-  std::optional<std::span<const std::uint8_t>> nextBody(bool hasClass) {
+  // The next frame: where its length prefix starts and its body's bytes;
+  // none at the end of the data. A length running past the end is a
+  // decoding failure when the body has a class, and the end of the data
+  // when it has none.
+  struct Frame {
+    const std::uint8_t* start;
+    std::span<const std::uint8_t> body;
+  };
+  std::optional<Frame> nextFrame(bool hasClass) {
     const bool bytesLeft = pos_ < size_;
     std::uint32_t length = 0;
-    if (!readLength(&length)) {
+    const std::size_t prefix = readFrameLength(data_ + pos_, data_ + size_, &length);
+    if (prefix == 0) {
       if (bytesLeft && hasClass) throw DecodeFailure{"malformed message length"};
       pos_ = size_;
       return std::nullopt;
     }
+    const std::uint8_t* start = data_ + pos_;
+    pos_ += prefix;
     if (length > size_ - pos_) {
       if (hasClass) throw DecodeFailure{"message length runs past the end of the data"};
       pos_ = size_;
@@ -70,26 +78,10 @@ class FrameCursor {
     }
     const std::uint8_t* body = data_ + pos_;
     pos_ += length;
-    return std::span(body, length);
+    return Frame{start, std::span(body, length)};
   }
 
  private:
-  // A body length as the protocol-buffer stream reads it: a varint of at
-  // most ten bytes, kept to its low 32 bits.
-  bool readLength(std::uint32_t* length) {
-    std::uint64_t value = 0;
-    for (unsigned i = 0; i < 10; ++i) {
-      if (pos_ >= size_) return false;
-      const std::uint8_t byte = data_[pos_++];
-      value |= static_cast<std::uint64_t>(byte & 0x7F) << (7 * i);
-      if (byte < 0x80) {
-        *length = static_cast<std::uint32_t>(value);
-        return true;
-      }
-    }
-    return false;
-  }
-
   const std::uint8_t* data_;
   std::size_t size_;
   std::size_t pos_ = 0;
@@ -148,20 +140,21 @@ FileRecords frameStatsData(const std::uint8_t* data, std::size_t size, const std
         }
       }
       // Keys above the table keep the class of the record before.
-      auto body = cursor.nextBody(nextClass.has_value());
-      if (!body) break;
+      const auto frame = cursor.nextFrame(nextClass.has_value());
+      if (!frame) break;
       if (!nextClass) continue;
+      const std::span<const std::uint8_t> body = frame->body;
 
       RecordRef ref;
       std::unique_ptr<Record> header;
       if (*nextClass == RecordClass::LogStartsV1) {
-        header = decodeHeader(*body);
+        header = decodeHeader(body);
         ref = RecordRef(header.get());
       } else {
-        checkLength(*body);
-        const Record* record = decoder.decode(*nextClass, *body);
+        checkLength(body);
+        const Record* record = decoder.decode(*nextClass, body);
         if (record == nullptr) failToDecode(*nextClass);
-        ref = RecordRef(*nextClass, record->absoluteTime(), record->wallTime(), *body);
+        ref = RecordRef(*nextClass, record->absoluteTime(), frame->start);
       }
 
       if (type == kLogStartsV1Type) {
@@ -215,6 +208,7 @@ FileRecords frameStatsFile(const std::string& path, const StoreQuery& query, Rec
   }
   FileRecords result = frameStatsData(file->data(), file->size(), path, query, decoder);
   if (!result.records.empty()) result.storage.files.push_back(std::move(file));
+  result.records.shrink_to_fit();  // kept until the boot's files are joined
   return result;
 }
 
@@ -226,12 +220,7 @@ class BootGrouper {
     const RecordRef& first = file.records.front();
     const Uuid boot = bootOf(first);
     const bool writerFive = asHeader(first).writer() == LogStartsV1::kSingleFileWriter;
-    std::vector<RecordRef>& bootRecords = out_.boots[boot];
-    if (bootRecords.empty()) {
-      bootRecords = std::move(file.records);
-    } else {
-      bootRecords.insert(bootRecords.end(), file.records.begin(), file.records.end());
-    }
+    files_[boot].push_back(std::move(file.records));
     out_.storage.take(std::move(file.storage));
     if (file.damaged) damaged_.push_back(boot);
     if (writerFive && !writerFiveSeen_.insert(boot).second) {
@@ -241,6 +230,19 @@ class BootGrouper {
 
   // Damaged boots keep only their headers, so the boot sequence stays whole.
   RecordsByBoot finish() {
+    // Each boot's files joined once, at their full size.
+    for (auto& [boot, files] : files_) {
+      std::vector<RecordRef>& records = out_.boots[boot];
+      records = std::move(files.front());
+      std::size_t total = 0;
+      for (const std::vector<RecordRef>& f : files) total += f.size();
+      records.reserve(total);
+      for (std::size_t i = 1; i < files.size(); ++i) {
+        records.insert(records.end(), files[i].begin(), files[i].end());
+        std::vector<RecordRef>().swap(files[i]);
+      }
+    }
+    files_.clear();
     for (const Uuid& boot : damaged_) {
       std::vector<RecordRef>& records = out_.boots[boot];
       std::erase_if(records, [](const RecordRef& r) { return r.recordClass() != RecordClass::LogStartsV1; });
@@ -250,6 +252,7 @@ class BootGrouper {
 
  private:
   RecordsByBoot out_;
+  std::unordered_map<Uuid, std::vector<std::vector<RecordRef>>> files_;  // per boot, in reading order
   std::vector<Uuid> damaged_;
   std::unordered_set<Uuid> writerFiveSeen_;
 };

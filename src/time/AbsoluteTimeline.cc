@@ -12,18 +12,28 @@ AbsoluteTimeline::AbsoluteTimeline(const BootTimeline* boot) : boot_(boot) {
   if (boot != nullptr) bootUuid_ = boot->uuid();
 }
 
-void AbsoluteTimeline::addObject(const RecordRef& record) {
+void AbsoluteTimeline::addObject(const RecordRef& record, std::uint64_t wallTime) {
+  widen(record, wallTime);
+  owned_.push_back(record);
+}
+
+void AbsoluteTimeline::addObjectInPlace(const RecordRef& record, std::uint64_t wallTime) {
+  widen(record, wallTime);
+  if (count_++ == 0) first_ = &record;
+}
+
+void AbsoluteTimeline::widen(const RecordRef& record, std::uint64_t wall) {
   const std::uint64_t time = record.absoluteTime();
-  if (!records_.empty() && time < records_.back().absoluteTime()) ascending_ = false;
+  const std::span<const RecordRef> added = records();
+  if (!added.empty() && time < added.back().absoluteTime()) ascending_ = false;
   startAbsoluteTime_ = std::min(startAbsoluteTime_, time);
   endAbsoluteTime_ = std::max(endAbsoluteTime_, time);
-  if (std::uint64_t wall = record.wallTime(); wall != 0) {
+  if (wall != 0) {
     if (skew_ != 0 && std::int64_t(wall - time) != skew_) {
       throw Exception(kInternalInconsistencyException, "event skew mismatch");
     }
     if (skew_ == 0) skew_ = std::int64_t(wall - startAbsoluteTime_);
   }
-  records_.push_back(record);
   invalidateFrom(parent());
 }
 
@@ -32,14 +42,13 @@ void AbsoluteTimeline::adjustSkew(std::int64_t delta) {
   invalidateFrom(parent());
 }
 
-bool AbsoluteTimeline::enumerateEventsWithOffset(std::uint64_t offset, const EventBlock& block) const {
+bool AbsoluteTimeline::enumerateRecordsWithOffset(std::uint64_t offset, const RecordBlock& block) const {
   AbsTime point{bootUuid_, 0};
   bool stop = false;
-  WalkDecoder decode;
-  for (const RecordRef& record : records_) {
+  for (const RecordRef& record : records()) {
     const std::uint64_t time = record.absoluteTime();
     point._setTime(time);
-    block(decode(record), offset + (time - startAbsoluteTime_), std::uint64_t(skew_) + time, point, stop);
+    block(record, offset + (time - startAbsoluteTime_), std::uint64_t(skew_) + time, point, stop);
     if (stop) return true;
   }
   return false;
@@ -50,18 +59,19 @@ bool AbsoluteTimeline::enumerateEventsWithOffset(std::uint64_t offset, const Eve
 bool AbsoluteTimeline::enumerateEventsInRelativeRanges(const std::vector<Range>& ranges, std::uint64_t offset,
                                                        const EventBlock& block) const {
   const std::uint64_t lastEnd = ranges.empty() ? 0 : ranges.back().end();
-  auto it = records_.begin();
+  const std::span<const RecordRef> records = this->records();
+  auto it = records.begin();
   if (ascending_ && !ranges.empty() && ranges.front().location > offset) {
     // Records before the first range are called for nothing and end nothing.
     const std::uint64_t firstTime = startAbsoluteTime_ + (ranges.front().location - offset);
-    it = std::partition_point(records_.begin(), records_.end(),
+    it = std::partition_point(records.begin(), records.end(),
                               [&](const RecordRef& r) { return r.absoluteTime() < firstTime; });
   }
   AbsTime point{bootUuid_, 0};
   WalkDecoder decode;
   auto cursor = ranges.begin();
   std::uint64_t previous = 0;
-  for (; it != records_.end(); ++it) {
+  for (; it != records.end(); ++it) {
     const std::uint64_t time = it->absoluteTime();
     const std::uint64_t position = offset + (time - startAbsoluteTime_);
     if (position > lastEnd) return true;

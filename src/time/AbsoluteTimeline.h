@@ -8,6 +8,7 @@
 // A record at absolute time t of a segment placed at offset X has the
 // position X + (t - startAbsoluteTime) and the wall time skew + t.
 #include <cstdint>
+#include <span>
 #include <vector>
 
 #include "Records/RecordRef.h"
@@ -24,11 +25,18 @@ class AbsoluteTimeline : public Timeline {
   explicit AbsoluteTimeline(const BootTimeline* boot);
 
   // Widens the absolute span to the record's time; a record with a wall
-  // time sets the skew (from the segment's lowest absolute time) or must
-  // match it, else throws kInternalInconsistencyException "event skew
-  // mismatch".
-  void addObject(const RecordRef& record);
-  const std::vector<RecordRef>& records() const { return records_; }
+  // time (`wallTime`, 0 for none) sets the skew (from the segment's lowest
+  // absolute time) or must match it, else throws
+  // kInternalInconsistencyException "event skew mismatch".
+  void addObject(const RecordRef& record, std::uint64_t wallTime);
+  void addObject(const Record* record) { addObject(record, record->wallTime()); }
+  // The same for a record that stays where it is, right after the last one
+  // added this way, in storage that outlives the segment: the segment then
+  // copies nothing. A segment takes its records one way or the other.
+  void addObjectInPlace(const RecordRef& record, std::uint64_t wallTime);
+  std::span<const RecordRef> records() const {
+    return owned_.empty() ? std::span<const RecordRef>(first_, count_) : std::span<const RecordRef>(owned_);
+  }
 
   // Adds `delta` to the skew (the boot moves early segments onto the clock).
   void adjustSkew(std::int64_t delta);
@@ -44,7 +52,7 @@ class AbsoluteTimeline : public Timeline {
   std::uint64_t endWallTime() const override { return std::uint64_t(skew_) + endAbsoluteTime_; }
   std::optional<AbsTime> highestAbsTime() const override { return AbsTime{bootUuid_, endAbsoluteTime_}; }
 
-  bool enumerateEventsWithOffset(std::uint64_t offset, const EventBlock& block) const override;
+  bool enumerateRecordsWithOffset(std::uint64_t offset, const RecordBlock& block) const override;
   // Calls the block once for each record inside some range; the first record
   // past the last range's end ends the segment's walk and returns true.
   bool enumerateEventsInRelativeRanges(const std::vector<Range>& ranges, std::uint64_t offset,
@@ -65,9 +73,14 @@ class AbsoluteTimeline : public Timeline {
                                                   std::uint64_t offset) const override;
 
  private:
+  // Takes the record's times into the segment's span and skew.
+  void widen(const RecordRef& record, std::uint64_t wallTime);
+
   const BootTimeline* boot_;
   Uuid bootUuid_;
-  std::vector<RecordRef> records_;
+  std::vector<RecordRef> owned_;      // records added by copy
+  const RecordRef* first_ = nullptr;  // or records left in place
+  std::size_t count_ = 0;
   std::uint64_t startAbsoluteTime_ = UINT64_MAX;
   std::uint64_t endAbsoluteTime_ = 0;
   std::int64_t skew_ = 0;

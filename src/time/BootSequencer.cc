@@ -102,9 +102,7 @@ std::map<std::string, std::unique_ptr<Timeline>> sequenceBoots(BootRecords& boot
       lastUUID = header.lastBootUUID();
       if (header.hasSystemVersion()) version = header.systemVersion();
     }
-    bootsByVersion[version].push_back(std::make_unique<BootTimeline>(*uuid, lastUUID, records));
-    // The segments hold their own handles now.
-    std::vector<RecordRef>().swap(records);
+    bootsByVersion[version].push_back(std::make_unique<BootTimeline>(*uuid, lastUUID, std::move(records)));
   }
 
   std::map<std::string, std::unique_ptr<Timeline>> result;

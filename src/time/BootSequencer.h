@@ -25,7 +25,7 @@ namespace bw {
 using BootRecords = std::unordered_map<Uuid, std::vector<RecordRef>>;
 
 // Sorts each boot's records by absolute time (ties keep their order), builds
-// its BootTimeline (handing over and emptying the boot's list) and returns the kept chain of each system
+// its BootTimeline (which takes over the boot's list) and returns the kept chain of each system
 // version (a boot's first record without one files it under "<unknown>").
 // Throws "invalid event stream detected" for a boot whose first record is
 // not a LogStartsV1, and kInternalInconsistencyException "boot uuid cycle

@@ -1,26 +1,28 @@
 #include "time/BootTimeline.h"
 
 #include "Records/LogStartsV1.h"
+#include "Records/RecordDecoder.h"
 #include "base/Exception.h"
 #include "time/AbsoluteTimeline.h"
 
 namespace bw {
 
-BootTimeline::BootTimeline(const Uuid& uuid, std::optional<Uuid> lastUUID, std::span<const RecordRef> events)
-    : uuid_(uuid), lastUUID_(lastUUID) {
-  if (events.empty() || events.front().recordClass() != RecordClass::LogStartsV1 || !events.front().decoded()) {
+BootTimeline::BootTimeline(const Uuid& uuid, std::optional<Uuid> lastUUID, std::vector<RecordRef> events)
+    : uuid_(uuid), lastUUID_(lastUUID), records_(std::move(events)) {
+  if (records_.empty() || records_.front().recordClass() != RecordClass::LogStartsV1 || !records_.front().decoded()) {
     throw Exception(kInvalidArgumentException, "invalid event stream detected");
   }
-  const auto& header = static_cast<const LogStartsV1&>(*events.front().decoded());
+  const auto& header = static_cast<const LogStartsV1&>(*records_.front().decoded());
   if (header.hasSystemVersion()) systemVersion_ = header.systemVersion();
 
   AbsoluteTimeline* current = nullptr;
   bool clockFixed = false;
-  for (const RecordRef& event : events) {
-    const std::uint64_t wall = event.wallTime();
+  RecordDecoder decoder;
+  for (const RecordRef& event : records_) {
+    const std::uint64_t wall = wallTimeOf(event, decoder);
     if (wall == 0) {
       if (current == nullptr) current = &newSegment();
-      current->addObject(event);
+      current->addObjectInPlace(event, 0);
       continue;
     }
     const std::int64_t skew = std::int64_t(wall - event.absoluteTime());
@@ -34,7 +36,7 @@ BootTimeline::BootTimeline(const Uuid& uuid, std::optional<Uuid> lastUUID, std::
       clockFixed = true;
     }
     if (current == nullptr || skew != current->skew()) current = &newSegment();
-    current->addObject(event);
+    current->addObjectInPlace(event, wall);
   }
   ensureIndex();
 }

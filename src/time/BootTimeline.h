@@ -30,8 +30,9 @@ class BootTimeline : public Timeline {
   // Builds the boot from `events`, sorted by absolute time. Throws
   // kInvalidArgumentException "invalid event stream detected" unless the
   // first record is exactly a LogStartsV1 kept decoded.
-  BootTimeline(const Uuid& uuid, std::optional<Uuid> lastUUID, std::span<const RecordRef> events);
-  BootTimeline(const Uuid& uuid, std::span<const RecordRef> events) : BootTimeline(uuid, std::nullopt, events) {}
+  // The boot keeps `events`; its segments point into them.
+  BootTimeline(const Uuid& uuid, std::optional<Uuid> lastUUID, std::vector<RecordRef> events);
+  BootTimeline(const Uuid& uuid, std::vector<RecordRef> events) : BootTimeline(uuid, std::nullopt, std::move(events)) {}
   // The same over records kept decoded, which must outlive the timeline.
   BootTimeline(const Uuid& uuid, std::optional<Uuid> lastUUID, std::span<Record* const> events)
       : BootTimeline(uuid, lastUUID, std::vector<RecordRef>(events.begin(), events.end())) {}
@@ -54,6 +55,7 @@ class BootTimeline : public Timeline {
   Uuid uuid_;
   std::optional<Uuid> lastUUID_;
   std::optional<std::string> systemVersion_;
+  std::vector<RecordRef> records_;
 };
 
 }  // namespace bw

@@ -2,6 +2,8 @@
 
 #include <algorithm>
 
+#include "Records/RecordDecoder.h"
+
 namespace bw {
 
 std::unique_ptr<Timeline> Timeline::timelineWithTimelines(std::vector<std::unique_ptr<Timeline>> timelines) {
@@ -89,9 +91,16 @@ bool Timeline::enumerateTimelinesWithOffset(std::uint64_t offset, const Timeline
 }
 
 bool Timeline::enumerateEventsWithOffset(std::uint64_t offset, const EventBlock& block) const {
+  WalkDecoder decode;
+  return enumerateRecordsWithOffset(
+      offset, [&](const RecordRef& record, std::uint64_t position, std::uint64_t wallTime, const AbsTime& absTime,
+                  bool& stop) { block(decode(record), position, wallTime, absTime, stop); });
+}
+
+bool Timeline::enumerateRecordsWithOffset(std::uint64_t offset, const RecordBlock& block) const {
   ensureIndex();
   for (std::size_t i = 0; i < children_.size(); ++i) {
-    if (children_[i]->enumerateEventsWithOffset(offset + offsets_[i], block)) return true;
+    if (children_[i]->enumerateRecordsWithOffset(offset + offsets_[i], block)) return true;
   }
   return false;
 }

@@ -25,6 +25,7 @@
 namespace bw {
 
 class Record;
+class RecordRef;
 class Timeline;
 
 // Called for each record of a walk with its position, its wall time and its
@@ -32,6 +33,9 @@ class Timeline;
 // to keep it. Setting `stop` ends a plain walk (range walks ignore it).
 using EventBlock = std::function<void(const Record& event, std::uint64_t position, std::uint64_t wallTime,
                                       const AbsTime& absTime, bool& stop)>;
+// The same walk over record handles: nothing is decoded.
+using RecordBlock = std::function<void(const RecordRef& record, std::uint64_t position, std::uint64_t wallTime,
+                                       const AbsTime& absTime, bool& stop)>;
 // Called for each child timeline with the child's offset on the axis.
 using TimelineBlock = std::function<void(const Timeline& child, std::uint64_t offset, bool& stop)>;
 
@@ -64,8 +68,12 @@ class Timeline {
 
   // Calls `block` with each child and its offset; true if the block stopped.
   virtual bool enumerateTimelinesWithOffset(std::uint64_t offset, const TimelineBlock& block) const;
-  // Walks every record in order; true if the block stopped.
-  virtual bool enumerateEventsWithOffset(std::uint64_t offset, const EventBlock& block) const;
+  // Walks every record in order, each decoded as the block gets it; true if
+  // the block stopped.
+  bool enumerateEventsWithOffset(std::uint64_t offset, const EventBlock& block) const;
+  // Walks every record's handle in order; true if the block stopped.
+  virtual bool enumerateRecordsWithOffset(std::uint64_t offset, const RecordBlock& block) const;
+  bool enumerateRecordsUsingBlock(const RecordBlock& block) const { return enumerateRecordsWithOffset(0, block); }
   bool enumerateEventsUsingBlock(const EventBlock& block) const { return enumerateEventsWithOffset(0, block); }
   // Calls `block` for the records whose position lies in one of `ranges`
   // (ascending, non-overlapping, half-open). The whole timeline is always

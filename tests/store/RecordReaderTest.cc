@@ -206,8 +206,9 @@ TEST_F(RecordReader, HandlesDecodeToWhatWasWrittenWithOnlyHeadersKeptDecoded) {
   EXPECT_EQ(r.storage.files.size(), 1u);
   EXPECT_NE(records[0].decoded(), nullptr);
   EXPECT_EQ(records[1].decoded(), nullptr);
-  EXPECT_EQ(std::tuple(records[2].wallTime(), records[3].wallTime()), std::tuple(test::kWallBase + 300, 0ull));
   RecordDecoder decoder;
+  EXPECT_EQ(std::tuple(wallTimeOf(records[2], decoder), wallTimeOf(records[3], decoder)),
+            std::tuple(test::kWallBase + 300, 0ull));
   const auto& wake = static_cast<const SleepWake&>(decoder.record(records[1]));
   EXPECT_EQ(std::tuple(wake.reason(), wake.wakeType()), std::tuple(SleepWake::kWake, std::string("Lid")));
   const auto& sleep = static_cast<const SleepWake&>(decoder.record(records[2]));
