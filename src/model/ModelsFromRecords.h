@@ -1,6 +1,6 @@
 #pragma once
 // The models of one read of the store: the boots sequenced and chained, one
-// model per system version, each keeping the records' pool alive.
+// model per system version, each keeping the records' storage alive.
 #include <memory>
 #include <vector>
 
