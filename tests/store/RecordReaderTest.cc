@@ -215,6 +215,14 @@ TEST_F(RecordReader, HandlesDecodeToWhatWasWrittenWithOnlyHeadersKeptDecoded) {
   EXPECT_EQ(&sleep, &wake);  // one value per class, reused
   EXPECT_EQ(std::tuple(sleep.reason(), sleep.hasWakeType(), sleep.wakeType(), sleep.absoluteTime()),
             std::tuple(SleepWake::kSleep, false, std::string(), 300ull));
+  // A walk started inside another walk's callback decodes into values of its own.
+  WalkDecoder outer;
+  const auto& outerWake = static_cast<const SleepWake&>(outer(records[1]));
+  {
+    WalkDecoder inner;
+    EXPECT_EQ(static_cast<const SleepWake&>(inner(records[2])).reason(), SleepWake::kSleep);
+  }
+  EXPECT_EQ(outerWake.wakeType(), "Lid");
 }
 
 // Framing on several threads hands files over in the order given: the same
