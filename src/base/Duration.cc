@@ -1,13 +1,23 @@
 #include "base/Duration.h"
 
-#include "base/Console.h"
+#include "base/DecimalText.h"
 
 namespace bw {
 
 std::string durationText(std::int64_t ms) {
-  long long hours = ms / 3600000;
-  long long seconds = ms / 1000 - hours * 3600;
-  return format("%02lld:%02lld:%02lld", hours, seconds / 60, seconds % 60);
+  std::string text;
+  appendDurationText(text, ms);
+  return text;
+}
+
+void appendDurationText(std::string& out, std::int64_t ms) {
+  const long long hours = ms / 3600000;
+  const long long seconds = ms / 1000 - hours * 3600;
+  appendDecimal(out, hours, 2, DecimalPad::kZeros);
+  out.push_back(':');
+  appendDecimal(out, seconds / 60, 2, DecimalPad::kZeros);
+  out.push_back(':');
+  appendDecimal(out, seconds % 60, 2, DecimalPad::kZeros);
 }
 
 }  // namespace bw
