@@ -262,9 +262,14 @@ Value elementsValue(const std::vector<E>& elements) {
 }
 
 // The start of a dictionary line: indentation, the key (quoted when
-// `kQuoted`, decided at compile time from the key) and " = ".
+// `kQuoted`, decided at compile time from the key) and " = ". `topText` is
+// the whole start at level 1, where a record's own fields are.
 template <bool kQuoted>
-void appendKeyText(std::string& out, int level, std::string_view key) {
+inline void appendKeyText(std::string& out, int level, std::string_view key, std::string_view topText) {
+  if (!kQuoted && level == 1) {
+    out += topText;
+    return;
+  }
   appendDescribedIndent(out, level);
   if constexpr (kQuoted) {
     appendDescribedString(out, key);
@@ -277,9 +282,10 @@ void appendKeyText(std::string& out, int level, std::string_view key) {
 // A repeated field's dictionary line: the elements' dictionaries in an
 // array; nothing for no elements.
 template <bool kQuoted, class E>
-void appendElementsText(std::string& out, int level, std::string_view key, const std::vector<E>& elements) {
+void appendElementsText(std::string& out, int level, std::string_view key, std::string_view topText,
+                        const std::vector<E>& elements) {
   if (elements.empty()) return;
-  appendKeyText<kQuoted>(out, level, key);
+  appendKeyText<kQuoted>(out, level, key, topText);
   out += "(\n";
   const RecordSchema& schema = E::schema();
   for (std::size_t i = 0; i < elements.size(); ++i) {
@@ -381,27 +387,27 @@ constexpr bool strictlyAscending(const FieldInfo (&fields)[n]) {
 #define BW_CODEC_COPY_TO_REPEATED(name, Name, number, Element, key) \
   if (!name##_.empty() && &t != this) t.name##_ = name##_;
 
-#define BW_CODEC_FIELD_INFO(name, Name, number, kind, presence, key)                                              \
-  ::bw::FieldInfo{                                                                                                \
-      #name,                                                                                                      \
-      number,                                                                                                     \
-      BW_CODEC_KIND(kind),                                                                                        \
-      BW_CODEC_REQUIRED(presence),                                                                                \
-      key,                                                                                                        \
-      kClass,                                                                                                     \
-      [](const ::bw::Record& r) -> ::bw::Value {                                                                  \
-        const auto& s = static_cast<const Self&>(r);                                                              \
-        if (!BW_CODEC_PRESENT(s, name, kind, presence)) return ::bw::Value();                                     \
-        return BW_CODEC_OF(kind)::value(s.name##_);                                                               \
-      },                                                                                                          \
-      [](::bw::Record& r, const ::bw::Value& v) { static_cast<Self&>(r).set##Name(BW_CODEC_OF(kind)::from(v)); }, \
-      nullptr,                                                                                                    \
-      [](const ::bw::Record& r, std::string& out, int level) {                                                    \
-        const auto& s = static_cast<const Self&>(r);                                                              \
-        if (!BW_CODEC_PRESENT(s, name, kind, presence)) return;                                                   \
-        ::bw::record_codec::appendKeyText<::bw::describedStringNeedsQuotes(key)>(out, level, key);                \
-        BW_CODEC_OF(kind)::appendText(out, s.name##_);                                                            \
-        out += ";\n";                                                                                             \
+#define BW_CODEC_FIELD_INFO(name, Name, number, kind, presence, key)                                                 \
+  ::bw::FieldInfo{                                                                                                   \
+      #name,                                                                                                         \
+      number,                                                                                                        \
+      BW_CODEC_KIND(kind),                                                                                           \
+      BW_CODEC_REQUIRED(presence),                                                                                   \
+      key,                                                                                                           \
+      kClass,                                                                                                        \
+      [](const ::bw::Record& r) -> ::bw::Value {                                                                     \
+        const auto& s = static_cast<const Self&>(r);                                                                 \
+        if (!BW_CODEC_PRESENT(s, name, kind, presence)) return ::bw::Value();                                        \
+        return BW_CODEC_OF(kind)::value(s.name##_);                                                                  \
+      },                                                                                                             \
+      [](::bw::Record& r, const ::bw::Value& v) { static_cast<Self&>(r).set##Name(BW_CODEC_OF(kind)::from(v)); },    \
+      nullptr,                                                                                                       \
+      [](const ::bw::Record& r, std::string& out, int level) {                                                       \
+        const auto& s = static_cast<const Self&>(r);                                                                 \
+        if (!BW_CODEC_PRESENT(s, name, kind, presence)) return;                                                      \
+        ::bw::record_codec::appendKeyText<::bw::describedStringNeedsQuotes(key)>(out, level, key, "    " key " = "); \
+        BW_CODEC_OF(kind)::appendText(out, s.name##_);                                                               \
+        out += ";\n";                                                                                                \
       }},
 #define BW_CODEC_REPEATED_INFO(name, Name, number, Element, key)                                   \
   ::bw::FieldInfo{#name,                                                                           \
@@ -420,7 +426,7 @@ constexpr bool strictlyAscending(const FieldInfo (&fields)[n]) {
                   },                                                                               \
                   [](const ::bw::Record& r, std::string& out, int level) {                         \
                     ::bw::record_codec::appendElementsText<::bw::describedStringNeedsQuotes(key)>( \
-                        out, level, key, static_cast<const Self&>(r).name##_);                     \
+                        out, level, key, "    " key " = ", static_cast<const Self&>(r).name##_);   \
                   }},
 
 // Defines every generic operation of `Class` (declared by
