@@ -15,8 +15,10 @@
 
 #include <algorithm>
 #include <array>
+#include <charconv>
 #include <cmath>
 #include <cstdint>
+#include <cstring>
 #include <functional>
 #include <memory>
 #include <string>
@@ -279,6 +281,33 @@ inline void appendKeyText(std::string& out, int level, std::string_view key, std
   out += " = ";
 }
 
+// A scalar field's dictionary line. An integer or boolean of a record's
+// own field, the bulk of a dump, is put together on the stack and appended
+// at once.
+template <FieldKind K, bool kQuoted, class T, std::size_t kTopSize>
+void appendFieldText(std::string& out, int level, std::string_view key, const char (&topText)[kTopSize], const T& v) {
+  constexpr std::size_t kTopLength = kTopSize - 1;
+  if constexpr (!kQuoted && K != FieldKind::Double && !isObject(K) && kTopLength <= 128) {
+    if (level == 1) {
+      char line[kTopLength + 24 + 2];
+      std::memcpy(line, topText, kTopLength);
+      char* end = line + kTopLength;
+      if constexpr (K == FieldKind::Bool) {
+        *end++ = v ? '1' : '0';
+      } else {
+        end = std::to_chars(end, end + 24, v).ptr;
+      }
+      *end++ = ';';
+      *end++ = '\n';
+      out.append(line, end);
+      return;
+    }
+  }
+  appendKeyText<kQuoted>(out, level, key, std::string_view(topText, kTopLength));
+  Codec<K>::appendText(out, v);
+  out += ";\n";
+}
+
 // A repeated field's dictionary line: the elements' dictionaries in an
 // array; nothing for no elements.
 template <bool kQuoted, class E>
@@ -387,27 +416,26 @@ constexpr bool strictlyAscending(const FieldInfo (&fields)[n]) {
 #define BW_CODEC_COPY_TO_REPEATED(name, Name, number, Element, key) \
   if (!name##_.empty() && &t != this) t.name##_ = name##_;
 
-#define BW_CODEC_FIELD_INFO(name, Name, number, kind, presence, key)                                                 \
-  ::bw::FieldInfo{                                                                                                   \
-      #name,                                                                                                         \
-      number,                                                                                                        \
-      BW_CODEC_KIND(kind),                                                                                           \
-      BW_CODEC_REQUIRED(presence),                                                                                   \
-      key,                                                                                                           \
-      kClass,                                                                                                        \
-      [](const ::bw::Record& r) -> ::bw::Value {                                                                     \
-        const auto& s = static_cast<const Self&>(r);                                                                 \
-        if (!BW_CODEC_PRESENT(s, name, kind, presence)) return ::bw::Value();                                        \
-        return BW_CODEC_OF(kind)::value(s.name##_);                                                                  \
-      },                                                                                                             \
-      [](::bw::Record& r, const ::bw::Value& v) { static_cast<Self&>(r).set##Name(BW_CODEC_OF(kind)::from(v)); },    \
-      nullptr,                                                                                                       \
-      [](const ::bw::Record& r, std::string& out, int level) {                                                       \
-        const auto& s = static_cast<const Self&>(r);                                                                 \
-        if (!BW_CODEC_PRESENT(s, name, kind, presence)) return;                                                      \
-        ::bw::record_codec::appendKeyText<::bw::describedStringNeedsQuotes(key)>(out, level, key, "    " key " = "); \
-        BW_CODEC_OF(kind)::appendText(out, s.name##_);                                                               \
-        out += ";\n";                                                                                                \
+#define BW_CODEC_FIELD_INFO(name, Name, number, kind, presence, key)                                              \
+  ::bw::FieldInfo{                                                                                                \
+      #name,                                                                                                      \
+      number,                                                                                                     \
+      BW_CODEC_KIND(kind),                                                                                        \
+      BW_CODEC_REQUIRED(presence),                                                                                \
+      key,                                                                                                        \
+      kClass,                                                                                                     \
+      [](const ::bw::Record& r) -> ::bw::Value {                                                                  \
+        const auto& s = static_cast<const Self&>(r);                                                              \
+        if (!BW_CODEC_PRESENT(s, name, kind, presence)) return ::bw::Value();                                     \
+        return BW_CODEC_OF(kind)::value(s.name##_);                                                               \
+      },                                                                                                          \
+      [](::bw::Record& r, const ::bw::Value& v) { static_cast<Self&>(r).set##Name(BW_CODEC_OF(kind)::from(v)); }, \
+      nullptr,                                                                                                    \
+      [](const ::bw::Record& r, std::string& out, int level) {                                                    \
+        const auto& s = static_cast<const Self&>(r);                                                              \
+        if (!BW_CODEC_PRESENT(s, name, kind, presence)) return;                                                   \
+        ::bw::record_codec::appendFieldText<BW_CODEC_KIND(kind), ::bw::describedStringNeedsQuotes(key)>(          \
+            out, level, key, "    " key " = ", s.name##_);                                                        \
       }},
 #define BW_CODEC_REPEATED_INFO(name, Name, number, Element, key)                                   \
   ::bw::FieldInfo{#name,                                                                           \
