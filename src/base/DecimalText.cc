@@ -1,6 +1,7 @@
 #include "base/DecimalText.h"
 
 #include <charconv>
+#include <cstring>
 
 namespace bw {
 
@@ -10,14 +11,21 @@ void appendPadded(std::string& out, bool negative, const char* digits, std::size
   const char sign = negative ? '-' : pad == DecimalPad::kSignSpace ? ' ' : '\0';
   const std::size_t used = length + (sign != '\0' ? 1 : 0);
   const std::size_t fill = width > 0 && static_cast<std::size_t>(width) > used ? width - used : 0;
-  if (pad == DecimalPad::kZeros) {
+  if (fill > 32) {  // wider than any text uses: piece by piece
+    if (pad != DecimalPad::kZeros) out.append(fill, ' ');
     if (sign != '\0') out.push_back(sign);
-    out.append(fill, '0');
-  } else {
-    out.append(fill, ' ');
-    if (sign != '\0') out.push_back(sign);
+    if (pad == DecimalPad::kZeros) out.append(fill, '0');
+    out.append(digits, length);
+    return;
   }
-  out.append(digits, length);
+  // Otherwise put together on the stack and appended at once.
+  char text[64];
+  char* p = text;
+  if (pad != DecimalPad::kZeros) p = static_cast<char*>(std::memset(p, ' ', fill)) + fill;
+  if (sign != '\0') *p++ = sign;
+  if (pad == DecimalPad::kZeros) p = static_cast<char*>(std::memset(p, '0', fill)) + fill;
+  std::memcpy(p, digits, length);
+  out.append(text, p + length);
 }
 
 }  // namespace

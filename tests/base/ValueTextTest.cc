@@ -95,7 +95,7 @@ TEST(Range, TouchingRangesIntersectInAnEmptyRangeAtTheTouchingPoint) {
 // The hot text writers' integers print as printf prints them.
 TEST(DecimalText, MatchesPrintfForEveryWidthAndFlag) {
   char expected[64];
-  for (int width : {0, 1, 2, 5, 8, 25}) {
+  for (int width : {0, 1, 2, 5, 8, 25, 60}) {
     for (long long v : {0LL, 7LL, -7LL, 42LL, -42LL, 123456789LL, LLONG_MIN, LLONG_MAX}) {
       std::string spaces, zeros, sign;
       appendDecimal(spaces, v, width);
