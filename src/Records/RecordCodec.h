@@ -299,7 +299,7 @@ void appendFieldText(std::string& out, int level, std::string_view key, const ch
       }
       *end++ = ';';
       *end++ = '\n';
-      out.append(line, end);
+      out.append(line, static_cast<std::size_t>(end - line));
       return;
     }
   }

@@ -1,31 +1,39 @@
 #include "base/DecimalText.h"
 
-#include <charconv>
-#include <cstring>
-
 namespace bw {
 
 namespace {
 
-void appendPadded(std::string& out, bool negative, const char* digits, std::size_t length, int width, DecimalPad pad) {
+// Writes the digits from the right end of a stack buffer, then the padding
+// and sign before them, and appends the lot at once: no library call but
+// the one append.
+void appendPadded(std::string& out, bool negative, unsigned long long magnitude, int width, DecimalPad pad) {
+  constexpr int kSize = 64;
+  char text[kSize];
+  char* const end = text + kSize;
+  char* p = end;
+  do {
+    *--p = static_cast<char>('0' + magnitude % 10);
+    magnitude /= 10;
+  } while (magnitude != 0);
   const char sign = negative ? '-' : pad == DecimalPad::kSignSpace ? ' ' : '\0';
-  const std::size_t used = length + (sign != '\0' ? 1 : 0);
-  const std::size_t fill = width > 0 && static_cast<std::size_t>(width) > used ? width - used : 0;
-  if (fill > 32) {  // wider than any text uses: piece by piece
-    if (pad != DecimalPad::kZeros) out.append(fill, ' ');
+  const int used = static_cast<int>(end - p) + (sign != '\0' ? 1 : 0);
+  const int fill = width > used ? width - used : 0;
+  if (fill > kSize - 24) {  // wider than any text uses: piece by piece
+    if (pad != DecimalPad::kZeros) out.append(static_cast<std::size_t>(fill), ' ');
     if (sign != '\0') out.push_back(sign);
-    if (pad == DecimalPad::kZeros) out.append(fill, '0');
-    out.append(digits, length);
+    if (pad == DecimalPad::kZeros) out.append(static_cast<std::size_t>(fill), '0');
+    out.append(p, static_cast<std::size_t>(end - p));
     return;
   }
-  // Otherwise put together on the stack and appended at once.
-  char text[64];
-  char* p = text;
-  if (pad != DecimalPad::kZeros) p = static_cast<char*>(std::memset(p, ' ', fill)) + fill;
-  if (sign != '\0') *p++ = sign;
-  if (pad == DecimalPad::kZeros) p = static_cast<char*>(std::memset(p, '0', fill)) + fill;
-  std::memcpy(p, digits, length);
-  out.append(text, p + length);
+  if (pad == DecimalPad::kZeros) {
+    for (int i = 0; i < fill; ++i) *--p = '0';
+    if (sign != '\0') *--p = sign;
+  } else {
+    if (sign != '\0') *--p = sign;
+    for (int i = 0; i < fill; ++i) *--p = ' ';
+  }
+  out.append(p, static_cast<std::size_t>(end - p));
 }
 
 }  // namespace
@@ -35,17 +43,12 @@ void appendDecimal(std::string& out, long long value, int width, DecimalPad pad)
   const bool negative = value < 0;
   const unsigned long long magnitude =
       negative ? 0ull - static_cast<unsigned long long>(value) : static_cast<unsigned long long>(value);
-  char digits[24];
-  const auto r = std::to_chars(digits, digits + sizeof digits, magnitude);
-  appendPadded(out, negative, digits, static_cast<std::size_t>(r.ptr - digits), width, pad);
+  appendPadded(out, negative, magnitude, width, pad);
 }
 
 void appendDecimal(std::string& out, unsigned long long value, int width, DecimalPad pad) {
   // As printf's unsigned conversions, which ignore the space flag.
-  if (pad == DecimalPad::kSignSpace) pad = DecimalPad::kSpaces;
-  char digits[24];
-  const auto r = std::to_chars(digits, digits + sizeof digits, value);
-  appendPadded(out, false, digits, static_cast<std::size_t>(r.ptr - digits), width, pad);
+  appendPadded(out, false, value, width, pad == DecimalPad::kSignSpace ? DecimalPad::kSpaces : pad);
 }
 
 }  // namespace bw

@@ -38,7 +38,7 @@ std::uint64_t Value::uint64Value() const {
 std::string describeNumber(const Value& v) {
   std::string out;
   if (auto* b = v.getIf<bool>()) {
-    out = *b ? "1" : "0";
+    out.push_back(*b ? '1' : '0');
   } else if (auto* i = v.getIf<std::int64_t>()) {
     appendDescribedInteger(out, *i);
   } else if (auto* u = v.getIf<std::uint64_t>()) {
@@ -66,13 +66,13 @@ constexpr std::array<bool, 256> kPlain = [] {
 void appendDescribedInteger(std::string& out, std::int64_t v) {
   char buf[24];
   auto r = std::to_chars(buf, buf + sizeof buf, v);
-  out.append(buf, r.ptr);
+  out.append(buf, static_cast<std::size_t>(r.ptr - buf));
 }
 
 void appendDescribedInteger(std::string& out, std::uint64_t v) {
   char buf[24];
   auto r = std::to_chars(buf, buf + sizeof buf, v);
-  out.append(buf, r.ptr);
+  out.append(buf, static_cast<std::size_t>(r.ptr - buf));
 }
 
 void appendDescribedDouble(std::string& out, double v) {
@@ -83,7 +83,7 @@ void appendDescribedDouble(std::string& out, double v) {
   } else {
     char buf[64];
     auto r = std::to_chars(buf, buf + sizeof buf, v);
-    out.append(buf, r.ptr);
+    out.append(buf, static_cast<std::size_t>(r.ptr - buf));
   }
 }
 

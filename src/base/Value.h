@@ -92,7 +92,9 @@ void appendDescribedData(std::string& out, std::string_view bytes);
 void appendDescribedInteger(std::string& out, std::int64_t v);
 void appendDescribedInteger(std::string& out, std::uint64_t v);
 void appendDescribedDouble(std::string& out, double v);
-inline void appendDescribedIndent(std::string& out, int level) { out.append(static_cast<std::size_t>(level) * 4, ' '); }
+inline void appendDescribedIndent(std::string& out, int level) {
+  if (level > 0) out.append(static_cast<std::size_t>(level) * 4, ' ');
+}
 // Whether appendDescribedString quotes `s`.
 constexpr bool describedStringNeedsQuotes(std::string_view s) {
   if (s.empty()) return true;
