@@ -21,6 +21,7 @@ class Cstates final : public Record {
   // "Package C-state detail: " when core is -1, else "Core %lld C-state
   // detail: ", then "C%llu %7llu   " (level, residency) per state. No newline.
   std::optional<std::string> prettyPrint() const override;
+  bool appendPrettyPrint(std::string& out) const override;
 
  private:
   BW_RECORD_STORAGE(BW_CSTATES_FIELDS, BW_CSTATES_REPEATED)

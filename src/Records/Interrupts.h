@@ -18,6 +18,7 @@ class Interrupts final : public Record {
   // "\tVector %@:\t%llu interrupts\n" per vector of that processor, in record
   // order. Processors come in ascending number.
   std::optional<std::string> prettyPrint() const override;
+  bool appendPrettyPrint(std::string& out) const override;
 
  private:
   BW_RECORD_STORAGE(BW_INTERRUPTS_FIELDS, BW_INTERRUPTS_REPEATED)

@@ -1,7 +1,7 @@
 #include "Records/ProcessUsage.h"
 
 #include "Records/RecordCodec.h"
-#include "base/Console.h"
+#include "base/DecimalText.h"
 #include "base/Duration.h"
 
 namespace bw {
@@ -18,24 +18,38 @@ std::optional<Uuid> ProcessUsage::UUID() const {
 }
 
 std::optional<std::string> ProcessUsage::prettyPrint() const {
-  std::string status;
+  std::string text;
+  appendPrettyPrint(text);
+  return text;
+}
+
+bool ProcessUsage::appendPrettyPrint(std::string& out) const {
   std::uint64_t elapsed;
+  out += "ProcessUsage\t";
   if (exitStatus() == -3) {
-    status = "S";
+    out += 'S';
     elapsed = 0;
   } else if (exitStatus() == -1) {
-    status = "-";
+    out += '-';
     elapsed = absoluteTime() - procStartAbstime();
   } else {
-    status = format("%lld", static_cast<long long>(exitStatus()));
+    appendDecimal(out, static_cast<long long>(exitStatus()));
     elapsed = procExitAbstime() - procStartAbstime();
   }
-  return "ProcessUsage\t" + status +
-         format("\t% 5lld msec\t", static_cast<long long>((userTime() + systemTime()) / 1000000)) +
-         durationText(static_cast<std::int64_t>(elapsed)) +
-         format("\t% 6lld intr wkups\tresident % 8lld\t%llu [", static_cast<long long>(interruptWkups()),
-                static_cast<long long>(residentSize()), static_cast<unsigned long long>(pid())) +
-         name() + "]";
+  out += '\t';
+  appendDecimal(out, static_cast<long long>((userTime() + systemTime()) / 1000000), 5, DecimalPad::kSignSpace);
+  out += " msec\t";
+  appendDurationText(out, static_cast<std::int64_t>(elapsed));
+  out += '\t';
+  appendDecimal(out, static_cast<long long>(interruptWkups()), 6, DecimalPad::kSignSpace);
+  out += " intr wkups\tresident ";
+  appendDecimal(out, static_cast<long long>(residentSize()), 8, DecimalPad::kSignSpace);
+  out += '\t';
+  appendDecimal(out, static_cast<unsigned long long>(pid()));
+  out += " [";
+  out += name();
+  out += ']';
+  return true;
 }
 
 }  // namespace bw

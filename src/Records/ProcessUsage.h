@@ -61,6 +61,7 @@ class ProcessUsage final : public Record {
   // minus procStartAbstime for -1, else procExitAbstime minus
   // procStartAbstime), interruptWkups, residentSize, pid, name.
   std::optional<std::string> prettyPrint() const override;
+  bool appendPrettyPrint(std::string& out) const override;
 
  private:
   BW_RECORD_STORAGE(BW_PROCESS_USAGE_FIELDS, BW_NO_REPEATED_FIELDS)

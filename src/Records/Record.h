@@ -59,8 +59,16 @@ class Record {
 
   // The one-line text; none for classes that have no such text.
   virtual std::optional<std::string> prettyPrint() const { return std::nullopt; }
+  // Appends the one-line text to `out` and answers true; appends nothing and
+  // answers false for classes that have no such text. The classes that
+  // dominate the event listing write it straight into `out`.
+  virtual bool appendPrettyPrint(std::string& out) const;
   // Each present field under its dictionary key.
   virtual Dictionary dictionaryRepresentation() const = 0;
+  // Appends the dictionary in the property-list text form at `level`, the
+  // same bytes as describeValue(Value(dictionaryRepresentation())) at level
+  // 0, without building the dictionary (the dump's writer).
+  void appendDictionaryText(std::string& out, int level = 0) const;
   // "ClassName <address> {dictionary}": the default description followed by
   // the dictionary in the property-list text form.
   std::string description() const;

@@ -14,8 +14,11 @@
 #include <google/protobuf/wire_format_lite.h>
 
 #include <algorithm>
+#include <array>
+#include <charconv>
 #include <cmath>
 #include <cstdint>
+#include <cstring>
 #include <functional>
 #include <memory>
 #include <string>
@@ -124,6 +127,7 @@ struct Codec<FieldKind::UInt64> : VarintCodec<std::uint64_t, WFL::TYPE_UINT64> {
   static std::size_t size(int n, std::uint64_t v) { return WFL::TagSize(n, WFL::TYPE_UINT64) + WFL::UInt64Size(v); }
   static Value value(std::uint64_t v) { return Value(static_cast<unsigned long long>(v)); }
   static std::uint64_t from(const Value& v) { return v.uint64Value(); }
+  static void appendText(std::string& out, std::uint64_t v) { appendDescribedInteger(out, v); }
 };
 template <>
 struct Codec<FieldKind::SInt64> : VarintCodec<std::int64_t, WFL::TYPE_SINT64> {
@@ -131,6 +135,7 @@ struct Codec<FieldKind::SInt64> : VarintCodec<std::int64_t, WFL::TYPE_SINT64> {
   static std::size_t size(int n, std::int64_t v) { return WFL::TagSize(n, WFL::TYPE_SINT64) + WFL::SInt64Size(v); }
   static Value value(std::int64_t v) { return Value(static_cast<long long>(v)); }
   static std::int64_t from(const Value& v) { return v.int64Value(); }
+  static void appendText(std::string& out, std::int64_t v) { appendDescribedInteger(out, v); }
 };
 template <>
 struct Codec<FieldKind::UInt32> : VarintCodec<std::uint32_t, WFL::TYPE_UINT32> {
@@ -138,6 +143,7 @@ struct Codec<FieldKind::UInt32> : VarintCodec<std::uint32_t, WFL::TYPE_UINT32> {
   static std::size_t size(int n, std::uint32_t v) { return WFL::TagSize(n, WFL::TYPE_UINT32) + WFL::UInt32Size(v); }
   static Value value(std::uint32_t v) { return Value(static_cast<unsigned long long>(v)); }
   static std::uint32_t from(const Value& v) { return static_cast<std::uint32_t>(v.uint64Value()); }
+  static void appendText(std::string& out, std::uint32_t v) { appendDescribedInteger(out, std::uint64_t{v}); }
 };
 template <>
 struct Codec<FieldKind::Int32> : VarintCodec<std::int32_t, WFL::TYPE_INT32> {
@@ -145,6 +151,7 @@ struct Codec<FieldKind::Int32> : VarintCodec<std::int32_t, WFL::TYPE_INT32> {
   static std::size_t size(int n, std::int32_t v) { return WFL::TagSize(n, WFL::TYPE_INT32) + WFL::Int32Size(v); }
   static Value value(std::int32_t v) { return Value(static_cast<long long>(v)); }
   static std::int32_t from(const Value& v) { return static_cast<std::int32_t>(v.int64Value()); }
+  static void appendText(std::string& out, std::int32_t v) { appendDescribedInteger(out, std::int64_t{v}); }
 };
 template <>
 struct Codec<FieldKind::Bool> : VarintCodec<bool, WFL::TYPE_BOOL> {
@@ -152,6 +159,7 @@ struct Codec<FieldKind::Bool> : VarintCodec<bool, WFL::TYPE_BOOL> {
   static std::size_t size(int n, bool) { return WFL::TagSize(n, WFL::TYPE_BOOL) + WFL::kBoolSize; }
   static Value value(bool v) { return Value(v); }
   static bool from(const Value& v) { return v.int64Value() != 0; }
+  static void appendText(std::string& out, bool v) { out.push_back(v ? '1' : '0'); }
 };
 template <>
 struct Codec<FieldKind::Double> {
@@ -161,6 +169,7 @@ struct Codec<FieldKind::Double> {
   static std::size_t size(int n, double) { return WFL::TagSize(n, WFL::TYPE_DOUBLE) + WFL::kDoubleSize; }
   static Value value(double v) { return Value(v); }
   static double from(const Value& v) { return v.doubleValue(); }
+  static void appendText(std::string& out, double v) { appendDescribedDouble(out, v); }
   static std::uint64_t hash(double v) { return hashDouble(v); }
 };
 
@@ -176,6 +185,7 @@ struct Codec<FieldKind::String> {
   }
   static Value value(const std::string& v) { return Value(v); }
   static std::string from(const Value& v) { return stringFromValue(v); }
+  static void appendText(std::string& out, const std::string& v) { appendDescribedString(out, v); }
   static std::uint64_t hash(const std::string& v) { return hashBytes(v); }
 };
 template <>
@@ -186,6 +196,7 @@ struct Codec<FieldKind::Bytes> {
   static std::size_t size(int n, const std::string& v) { return WFL::TagSize(n, WFL::TYPE_BYTES) + WFL::BytesSize(v); }
   static Value value(const std::string& v) { return Value(Data(v.begin(), v.end())); }
   static std::string from(const Value& v) { return stringFromValue(v); }
+  static void appendText(std::string& out, const std::string& v) { appendDescribedData(out, v); }
   static std::uint64_t hash(const std::string& v) { return hashBytes(v); }
 };
 
@@ -257,6 +268,91 @@ Value elementsValue(const std::vector<E>& elements) {
   array.reserve(elements.size());
   for (const E& e : elements) array.emplace_back(e.dictionaryRepresentation());
   return Value(std::move(array));
+}
+
+// The start of a dictionary line: indentation, the key (quoted when
+// `kQuoted`, decided at compile time from the key) and " = ". `topText` is
+// the whole start at level 1, where a record's own fields are.
+template <bool kQuoted>
+inline void appendKeyText(std::string& out, int level, std::string_view key, std::string_view topText) {
+  if (!kQuoted && level == 1) {
+    out += topText;
+    return;
+  }
+  appendDescribedIndent(out, level);
+  if constexpr (kQuoted) {
+    appendDescribedString(out, key);
+  } else {
+    out += key;
+  }
+  out += " = ";
+}
+
+// A scalar field's dictionary line. An integer or boolean of a record's
+// own field, the bulk of a dump, is put together on the stack and appended
+// at once.
+template <FieldKind K, bool kQuoted, class T, std::size_t kTopSize>
+void appendFieldText(std::string& out, int level, std::string_view key, const char (&topText)[kTopSize], const T& v) {
+  constexpr std::size_t kTopLength = kTopSize - 1;
+  if constexpr (!kQuoted && K != FieldKind::Double && !isObject(K) && kTopLength <= 128) {
+    if (level == 1) {
+      char line[kTopLength + 24 + 2];
+      std::memcpy(line, topText, kTopLength);
+      char* end = line + kTopLength;
+      if constexpr (K == FieldKind::Bool) {
+        *end++ = v ? '1' : '0';
+      } else {
+        end = std::to_chars(end, end + 24, v).ptr;
+      }
+      *end++ = ';';
+      *end++ = '\n';
+      out.append(line, static_cast<std::size_t>(end - line));
+      return;
+    }
+  }
+  appendKeyText<kQuoted>(out, level, key, std::string_view(topText, kTopLength));
+  Codec<K>::appendText(out, v);
+  out += ";\n";
+}
+
+// A repeated field's dictionary line: the elements' dictionaries in an
+// array; nothing for no elements.
+template <bool kQuoted, class E>
+void appendElementsText(std::string& out, int level, std::string_view key, std::string_view topText,
+                        const std::vector<E>& elements) {
+  if (elements.empty()) return;
+  appendKeyText<kQuoted>(out, level, key, topText);
+  out += "(\n";
+  const RecordSchema& schema = E::schema();
+  for (std::size_t i = 0; i < elements.size(); ++i) {
+    appendDescribedIndent(out, level + 1);
+    appendDictionaryText(elements[i], schema, out, level + 1);
+    out += i + 1 < elements.size() ? ",\n" : "\n";
+  }
+  appendDescribedIndent(out, level);
+  out += ");\n";
+}
+
+// The fields' indexes ordered by key, as the dictionary (a sorted map)
+// orders them.
+template <std::size_t n>
+constexpr std::array<std::uint8_t, n> keyOrder(const FieldInfo (&fields)[n]) {
+  static_assert(n <= 256, "field indexes are bytes");
+  std::array<std::uint8_t, n> order{};
+  for (std::size_t i = 0; i < n; ++i) order[i] = static_cast<std::uint8_t>(i);
+  std::sort(order.begin(), order.end(), [&](std::uint8_t a, std::uint8_t b) {
+    return std::string_view(fields[a].key) < std::string_view(fields[b].key);
+  });
+  return order;
+}
+
+// Whether no two fields share a dictionary key.
+template <std::size_t n>
+constexpr bool distinctKeys(const FieldInfo (&fields)[n]) {
+  const std::array<std::uint8_t, n> order = keyOrder(fields);
+  for (std::size_t i = 1; i < n; ++i)
+    if (std::string_view(fields[order[i - 1]].key) == std::string_view(fields[order[i]].key)) return false;
+  return true;
 }
 
 // Whether the numbers strictly ascend, which writeTo's field order relies on.
@@ -343,7 +439,13 @@ constexpr bool strictlyAscending(const FieldInfo (&fields)[n]) {
         return BW_CODEC_OF(kind)::value(s.name##_);                                                               \
       },                                                                                                          \
       [](::bw::Record& r, const ::bw::Value& v) { static_cast<Self&>(r).set##Name(BW_CODEC_OF(kind)::from(v)); }, \
-      nullptr},
+      nullptr,                                                                                                    \
+      [](const ::bw::Record& r, std::string& out, int level) {                                                    \
+        const auto& s = static_cast<const Self&>(r);                                                              \
+        if (!BW_CODEC_PRESENT(s, name, kind, presence)) return;                                                   \
+        ::bw::record_codec::appendFieldText<BW_CODEC_KIND(kind), ::bw::describedStringNeedsQuotes(key)>(          \
+            out, level, key, "    " key " = ", s.name##_);                                                        \
+      }},
 #define BW_CODEC_REPEATED_INFO(name, Name, number, Element, key)                                   \
   ::bw::FieldInfo{#name,                                                                           \
                   number,                                                                          \
@@ -358,6 +460,10 @@ constexpr bool strictlyAscending(const FieldInfo (&fields)[n]) {
                   [](::bw::Record& r, const ::bw::Record& e) {                                     \
                     const Element* element = ::bw::recordCast<Element>(&e);                        \
                     if (element != nullptr) static_cast<Self&>(r).add##Name(*element);             \
+                  },                                                                               \
+                  [](const ::bw::Record& r, std::string& out, int level) {                         \
+                    ::bw::record_codec::appendElementsText<::bw::describedStringNeedsQuotes(key)>( \
+                        out, level, key, "    " key " = ", static_cast<const Self&>(r).name##_);   \
                   }},
 
 // Defines every generic operation of `Class` (declared by
@@ -424,6 +530,8 @@ constexpr bool strictlyAscending(const FieldInfo (&fields)[n]) {
     using Self = Class;                                                                                          \
     static constexpr ::bw::FieldInfo kFields[] = {FIELDS(BW_CODEC_FIELD_INFO) REPEATED(BW_CODEC_REPEATED_INFO)}; \
     static_assert(::bw::record_codec::strictlyAscending(kFields), "fields must ascend by number");               \
-    static const ::bw::RecordSchema kSchema{kClass, #Class, kFields};                                            \
+    static_assert(::bw::record_codec::distinctKeys(kFields), "dictionary keys must differ");                     \
+    static constexpr auto kKeyOrder = ::bw::record_codec::keyOrder(kFields);                                     \
+    static const ::bw::RecordSchema kSchema{kClass, #Class, kFields, kKeyOrder};                                 \
     return kSchema;                                                                                              \
   }

@@ -5,6 +5,7 @@
 // looks them up by class tag.
 #include <cstdint>
 #include <span>
+#include <string>
 
 #include "Records/Record.h"
 #include "base/Value.h"
@@ -34,12 +35,17 @@ struct FieldInfo {
   // Appends a copy of `element` (of `elementClass`) to a repeated field.
   // Null for every other kind.
   void (*add)(Record& record, const Record& element);
+  // Appends the field's `key = value;` line of the dictionary's text form,
+  // indented to `level`, when the field is present; nothing otherwise.
+  void (*appendText)(const Record& record, std::string& out, int level);
 };
 
 struct RecordSchema {
   RecordClass recordClass;
   const char* className;
   std::span<const FieldInfo> fields;  // in ascending field number
+  // Indexes into `fields` in the dictionary's order (ascending key).
+  std::span<const std::uint8_t> keyOrder;
 
   // The field with that number, or null.
   const FieldInfo* field(std::uint32_t number) const {
@@ -48,5 +54,11 @@ struct RecordSchema {
     return nullptr;
   }
 };
+
+// The record's dictionary in the property-list text form, as
+// describeValue(Value(record.dictionaryRepresentation())) prints it with the
+// dictionary at `level`, appended to `out` without building the dictionary.
+// `schema` is the record's class's.
+void appendDictionaryText(const Record& record, const RecordSchema& schema, std::string& out, int level);
 
 }  // namespace bw

@@ -8,5 +8,7 @@ namespace bw {
 // "%02lld:%02lld:%02lld": whole hours (not limited to two digits), then the
 // minutes and seconds of the remainder.
 std::string durationText(std::int64_t milliseconds);
+// The same text appended to `out`.
+void appendDurationText(std::string& out, std::int64_t milliseconds);
 
 }  // namespace bw

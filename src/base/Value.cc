@@ -1,5 +1,6 @@
 #include "base/Value.h"
 
+#include <array>
 #include <charconv>
 #include <cmath>
 #include <cstdio>
@@ -35,33 +36,66 @@ std::uint64_t Value::uint64Value() const {
 }
 
 std::string describeNumber(const Value& v) {
-  if (auto* b = v.getIf<bool>()) return *b ? "1" : "0";
-  if (auto* i = v.getIf<std::int64_t>()) return std::to_string(*i);
-  if (auto* u = v.getIf<std::uint64_t>()) return std::to_string(*u);
-  if (auto* d = v.getIf<double>()) {
-    if (std::isnan(*d)) return "nan";
-    if (std::isinf(*d)) return *d > 0 ? "inf" : "-inf";
-    char buf[64];
-    auto r = std::to_chars(buf, buf + sizeof buf, *d);
-    return std::string(buf, r.ptr);
+  std::string out;
+  if (auto* b = v.getIf<bool>()) {
+    out.push_back(*b ? '1' : '0');
+  } else if (auto* i = v.getIf<std::int64_t>()) {
+    appendDescribedInteger(out, *i);
+  } else if (auto* u = v.getIf<std::uint64_t>()) {
+    appendDescribedInteger(out, *u);
+  } else if (auto* d = v.getIf<double>()) {
+    appendDescribedDouble(out, *d);
   }
-  return "";
+  return out;
 }
 
 namespace {
 
-bool needsQuotes(const std::string& s) {
-  if (s.empty()) return true;
-  for (unsigned char c : s) {
-    bool plain = (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') || (c >= '0' && c <= '9') || c == '_' || c == '$' ||
-                 c == '.' || c == '/' || c == ':' || c == '-';
-    if (!plain) return true;
+// Which bytes a string may hold and still print unquoted.
+constexpr std::array<bool, 256> kPlain = [] {
+  std::array<bool, 256> plain{};
+  for (int c = 0; c < 256; ++c) {
+    const char one[1] = {static_cast<char>(c)};
+    plain[static_cast<std::size_t>(c)] = !describedStringNeedsQuotes(std::string_view(one, 1));
   }
-  return false;
+  return plain;
+}();
+
+}  // namespace
+
+void appendDescribedInteger(std::string& out, std::int64_t v) {
+  char buf[24];
+  auto r = std::to_chars(buf, buf + sizeof buf, v);
+  out.append(buf, static_cast<std::size_t>(r.ptr - buf));
 }
 
-void appendString(std::string& out, const std::string& s) {
-  if (!needsQuotes(s)) {
+void appendDescribedInteger(std::string& out, std::uint64_t v) {
+  char buf[24];
+  auto r = std::to_chars(buf, buf + sizeof buf, v);
+  out.append(buf, static_cast<std::size_t>(r.ptr - buf));
+}
+
+void appendDescribedDouble(std::string& out, double v) {
+  if (std::isnan(v)) {
+    out += "nan";
+  } else if (std::isinf(v)) {
+    out += v > 0 ? "inf" : "-inf";
+  } else {
+    char buf[64];
+    auto r = std::to_chars(buf, buf + sizeof buf, v);
+    out.append(buf, static_cast<std::size_t>(r.ptr - buf));
+  }
+}
+
+void appendDescribedString(std::string& out, std::string_view s) {
+  bool quote = s.empty();
+  for (char c : s) {
+    if (!kPlain[static_cast<unsigned char>(c)]) {
+      quote = true;
+      break;
+    }
+  }
+  if (!quote) {
     out += s;
     return;
   }
@@ -90,7 +124,24 @@ void appendString(std::string& out, const std::string& s) {
   out.push_back('"');
 }
 
-void indent(std::string& out, int level) { out.append(static_cast<std::size_t>(level) * 4, ' '); }
+void appendDescribedData(std::string& out, std::string_view bytes) {
+  static const char kHex[] = "0123456789abcdef";
+  const std::size_t start = out.size();
+  const std::size_t n = bytes.size();
+  // Two digits a byte, a space before every fourth byte but the first, and the brackets.
+  out.resize(start + 2 * n + (n > 0 ? (n - 1) / 4 : 0) + 2);
+  char* p = out.data() + start;
+  *p++ = '<';
+  for (std::size_t i = 0; i < n; ++i) {
+    if (i > 0 && i % 4 == 0) *p++ = ' ';
+    const auto b = static_cast<unsigned char>(bytes[i]);
+    *p++ = kHex[b >> 4];
+    *p++ = kHex[b & 0xF];
+  }
+  *p = '>';
+}
+
+namespace {
 
 void append(std::string& out, const Value& v, int level) {
   if (v.isNull()) {
@@ -98,37 +149,30 @@ void append(std::string& out, const Value& v, int level) {
   } else if (v.isNumber()) {
     out += describeNumber(v);
   } else if (auto* s = v.getIf<std::string>()) {
-    appendString(out, *s);
+    appendDescribedString(out, *s);
   } else if (auto* d = v.getIf<Data>()) {
-    static const char kHex[] = "0123456789abcdef";
-    out.push_back('<');
-    for (std::size_t i = 0; i < d->size(); ++i) {
-      if (i > 0 && i % 4 == 0) out.push_back(' ');
-      out.push_back(kHex[(*d)[i] >> 4]);
-      out.push_back(kHex[(*d)[i] & 0xF]);
-    }
-    out.push_back('>');
+    appendDescribedData(out, std::string_view(reinterpret_cast<const char*>(d->data()), d->size()));
   } else if (auto* date = v.getIf<Date>()) {
-    appendString(out, describeDate(*date));
+    appendDescribedString(out, describeDate(*date));
   } else if (auto* a = v.getIf<Array>()) {
     out += "(\n";
     for (std::size_t i = 0; i < a->size(); ++i) {
-      indent(out, level + 1);
+      appendDescribedIndent(out, level + 1);
       append(out, (*a)[i], level + 1);
       out += i + 1 < a->size() ? ",\n" : "\n";
     }
-    indent(out, level);
+    appendDescribedIndent(out, level);
     out.push_back(')');
   } else if (auto* dict = v.getIf<Dictionary>()) {
     out += "{\n";
     for (const auto& [key, value] : *dict) {
-      indent(out, level + 1);
-      appendString(out, key);
+      appendDescribedIndent(out, level + 1);
+      appendDescribedString(out, key);
       out += " = ";
       append(out, value, level + 1);
       out += ";\n";
     }
-    indent(out, level);
+    appendDescribedIndent(out, level);
     out.push_back('}');
   }
 }

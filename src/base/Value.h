@@ -6,6 +6,7 @@
 #include <map>
 #include <memory>
 #include <string>
+#include <string_view>
 #include <variant>
 #include <vector>
 
@@ -82,5 +83,28 @@ std::string describeNumber(const Value& v);
 // arrays, four spaces of indentation per level, strings quoted only when
 // they hold characters other than letters, digits and `_$./:-`.
 std::string describeValue(const Value& v);
+
+// The pieces of that text form, appended to `out`, for writers that print
+// without building Values first (the record dump). describeValue is made
+// of them, so both print alike.
+void appendDescribedString(std::string& out, std::string_view s);
+void appendDescribedData(std::string& out, std::string_view bytes);
+void appendDescribedInteger(std::string& out, std::int64_t v);
+void appendDescribedInteger(std::string& out, std::uint64_t v);
+void appendDescribedDouble(std::string& out, double v);
+inline void appendDescribedIndent(std::string& out, int level) {
+  if (level > 0) out.append(static_cast<std::size_t>(level) * 4, ' ');
+}
+// Whether appendDescribedString quotes `s`.
+constexpr bool describedStringNeedsQuotes(std::string_view s) {
+  if (s.empty()) return true;
+  for (char ch : s) {
+    const unsigned char c = static_cast<unsigned char>(ch);
+    const bool plain = (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') || (c >= '0' && c <= '9') || c == '_' ||
+                       c == '$' || c == '.' || c == '/' || c == ':' || c == '-';
+    if (!plain) return true;
+  }
+  return false;
+}
 
 }  // namespace bw

@@ -9,10 +9,12 @@
 #include "Records/PowerStateChange.h"
 #include "Records/SleepWake.h"
 #include "base/Console.h"
+#include "base/DecimalText.h"
 #include "cli/EmptyResult.h"
 #include "cli/ModelLoader.h"
 #include "cli/ModelRunner.h"
 #include "cli/Options.h"
+#include "cli/OutputBuffer.h"
 #include "cli/StoreWatch.h"
 #include "domains/Domain.h"
 #include "domains/WallTimeText.h"
@@ -35,15 +37,23 @@ void runRecordDump(const Options& options) {
     reached = EmptyStage::kNoRange;
     if (domain->ranges().empty()) continue;
     std::optional<Uuid> shownBoot;  // starts afresh for every model
+    OutputBuffer buffer(o);
+    std::string& text = buffer.text();
     model->timeline().enumerateEventsInRelativeRanges(
         domain->ranges(), [&](const Record& event, std::uint64_t, std::uint64_t, const AbsTime& absTime, bool&) {
           if (!printed) watch.end();
           printed = true;
           if (shownBoot != absTime.boot) {
             shownBoot = absTime.boot;
-            o << "===== Boot " << absTime.boot.string() << " =====\n";
+            text += "===== Boot ";
+            text += absTime.boot.string();
+            text += " =====\n";
           }
-          o << event.className() << ' ' << describeValue(Value(event.dictionaryRepresentation())) << '\n';
+          text += event.className();
+          text += ' ';
+          event.appendDictionaryText(text);
+          text += '\n';
+          buffer.lineDone();
         });
   }
   watch.end();
@@ -53,17 +63,29 @@ void runRecordDump(const Options& options) {
 void runEventListing(const Options& options) {
   std::ostream& o = out();
   runPerModel(options, [&](const Model& model, const std::vector<Range>& ranges) {
+    OutputBuffer buffer(o);
+    std::string& text = buffer.text();
+    // The date's text depends on the second alone; records come many a second.
+    std::uint64_t dateSecond = std::numeric_limits<std::uint64_t>::max();
+    std::string date;
     model.timeline().enumerateEventsInRelativeRanges(
         ranges, [&](const Record& event, std::uint64_t position, std::uint64_t wallTime, const AbsTime&, bool&) {
-          std::optional<std::string> pretty = event.prettyPrint();
-          const std::string text = pretty ? *pretty : std::string(event.className());
-          const std::string date = formatWallTime(wallTime);
-          if (gDebug) {
-            o << position << '\t' << event.absoluteTime() << '\t' << (event.answersWallTime() ? "*" : " ") << date
-              << '\t' << text << '\n';
-          } else {
-            o << date << '\t' << text << '\n';
+          if (wallTime / 1000 != dateSecond) {
+            dateSecond = wallTime / 1000;
+            date = formatWallTime(wallTime);
           }
+          if (gDebug) {
+            appendDecimal(text, static_cast<unsigned long long>(position));
+            text += '\t';
+            appendDecimal(text, static_cast<unsigned long long>(event.absoluteTime()));
+            text += '\t';
+            text += event.answersWallTime() ? '*' : ' ';
+          }
+          text += date;
+          text += '\t';
+          if (!event.appendPrettyPrint(text)) text += event.className();
+          text += '\n';
+          buffer.lineDone();
         });
   });
 }

@@ -3,11 +3,11 @@
 #include <unicode/smpdtfmt.h>
 #include <unicode/timezone.h>
 
-#include <cstdio>
 #include <memory>
 #include <mutex>
 
 #include "base/Console.h"
+#include "base/DecimalText.h"
 #include "time/Calendar.h"
 
 namespace bw {
@@ -67,16 +67,24 @@ std::string formatWallTime(std::uint64_t ms) {
   if (U_FAILURE(status) || year < 1600 || year > 9999 || (offsetSeconds % 60) != 0) {
     text = formatWithIcu(ms, withOffset);
   } else {
-    char buf[48];
-    int n = std::snprintf(buf, sizeof buf, "%04lld-%02u-%02u %02lld:%02lld:%02lld", static_cast<long long>(year), month,
-                          day, static_cast<long long>(secondOfDay / 3600),
-                          static_cast<long long>(secondOfDay / 60 % 60), static_cast<long long>(secondOfDay % 60));
+    const auto two = [&text](long long v) { appendDecimal(text, v, 2, DecimalPad::kZeros); };
+    appendDecimal(text, static_cast<long long>(year), 4, DecimalPad::kZeros);
+    text += '-';
+    two(month);
+    text += '-';
+    two(day);
+    text += ' ';
+    two(secondOfDay / 3600);
+    text += ':';
+    two(secondOfDay / 60 % 60);
+    text += ':';
+    two(secondOfDay % 60);
     if (withOffset) {
       const std::int64_t minutes = (offsetSeconds < 0 ? -offsetSeconds : offsetSeconds) / 60;
-      std::snprintf(buf + n, sizeof buf - static_cast<std::size_t>(n), " %c%02lld%02lld", offsetSeconds < 0 ? '-' : '+',
-                    static_cast<long long>(minutes / 60), static_cast<long long>(minutes % 60));
+      text += offsetSeconds < 0 ? " -" : " +";
+      two(minutes / 60);
+      two(minutes % 60);
     }
-    text = buf;
   }
   cachedSecond = second;
   cachedMode = withOffset;

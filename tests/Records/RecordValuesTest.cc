@@ -5,7 +5,10 @@
 // required string.
 #include <gtest/gtest.h>
 
+#include <cmath>
+#include <limits>
 #include <map>
+#include <random>
 #include <set>
 
 #include "RecordTestSupport.h"
@@ -83,6 +86,66 @@ TEST(RecordDictionary, DescriptionIsTheDefaultDescriptionThenTheDictionary) {
   EXPECT_TRUE(text.ends_with("> {\n    absoluteTime = 42;\n    change = 1;\n}")) << text;
 }
 
+// Awkward values of each field kind, in FieldKind order: extremes, signs,
+// strings that must be quoted and escaped, byte counts around the hex
+// groups, doubles with exponents and the non-finite ones.
+const std::vector<Value> kAwkward[] = {
+    {0u, 1u, 10u, ~0ull, 1ull << 63},
+    {0, -1, -3, std::numeric_limits<long long>::min(), std::numeric_limits<long long>::max()},
+    {0u, 4294967295u},
+    {-1, 0, std::numeric_limits<int>::min(), std::numeric_limits<int>::max()},
+    {true, false},
+    {0.0, -0.0, 0.1, -2.5, 1e300, 5e-324, 1.0 / 3, 123456789012345680.0, std::nan(""),
+     std::numeric_limits<double>::infinity(), -std::numeric_limits<double>::infinity()},
+    {"", "plain_$./:-09", "two words", "q\"b\\s\nn\tt\rr", "\xc3\xa9t\xc3\xa9", std::string("nul\0byte", 8),
+     "{a = (b, c);}"},
+    {Data{}, Data{0}, Data{1, 2, 3, 4}, Data{0xff, 0xfe, 0x80, 0x7f, 0},
+     Data{0, 1, 2, 3, 4, 5, 6, 7, 8, 9, 10, 11, 12, 13, 14, 255}},
+};
+
+// Every field set, field i to the awkward value (round + i) of its kind; a
+// repeated field gets `round % 3` elements, filled the same way.
+void fillAwkwardly(Record& record, std::size_t round) {
+  const RecordSchema& schema = recordSchema(record.recordClass());
+  for (std::size_t i = 0; i < schema.fields.size(); ++i) {
+    const FieldInfo& f = schema.fields[i];
+    if (f.kind != FieldKind::Message) {
+      const std::vector<Value>& values = kAwkward[static_cast<int>(f.kind)];
+      f.set(record, values[(round + i) % values.size()]);
+      continue;
+    }
+    for (std::size_t n = 0; n < round % 3; ++n) {
+      std::unique_ptr<Record> element = makeRecord(f.elementClass);
+      fillAwkwardly(*element, round + n + 1);
+      f.add(record, *element);
+    }
+  }
+}
+
+// The dump's writer prints what the dictionary prints, byte for byte: for
+// every class, every field set to each awkward value in turn, then fields
+// present or absent at random.
+TEST(RecordDictionary, TheDirectWriterPrintsWhatTheDictionaryPrints) {
+  std::mt19937_64 random(77);
+  for (RecordClass c : test::allRecordClasses()) {
+    std::vector<std::unique_ptr<Record>> records;
+    records.push_back(makeRecord(c));
+    for (std::size_t round = 0; round < 11; ++round) {
+      records.push_back(makeRecord(c));
+      fillAwkwardly(*records.back(), round);
+    }
+    for (int i = 0; i < 30; ++i) {
+      records.push_back(makeRecord(c));
+      test::fillRandomly(*records.back(), random);
+    }
+    for (const std::unique_ptr<Record>& record : records) {
+      std::string text = "before ";
+      record->appendDictionaryText(text);
+      EXPECT_EQ(text, "before " + describeValue(Value(record->dictionaryRepresentation())));
+    }
+  }
+}
+
 const Uuid kBoot = *Uuid::parse("6A1C1D4E-0B7F-4E3A-9C2D-5F8E7A6B4C3D");
 const std::string kRaw(kBoot.bytes().begin(), kBoot.bytes().end());
 
@@ -134,6 +197,16 @@ TEST(OneLineText, MatchesTheExpectedTextForEveryCase) {
       {C::ProcessUsage, process({{"exitStatus", -1}}), "ProcessUsage\t-" + running},
       {C::ProcessUsage, process({{"exitStatus", -3}}), "ProcessUsage\tS" + sampled},
       {C::ProcessUsage, {}, "ProcessUsage\t0\t    0 msec\t00:00:00\t     0 intr wkups\tresident        0\t0 []"},
+      {C::ProcessUsage,  // a start after the exit, counters past the signed range
+       {{"exitStatus", 5},
+        {"procStartAbstime", 5000},
+        {"procExitAbstime", 1000},
+        {"interruptWkups", ~0ull},
+        {"residentSize", 1ull << 63},
+        {"pid", ~0ull},
+        {"name", "a b"}},
+       "ProcessUsage\t5\t    0 msec\t00:00:-4\t    -1 intr wkups\tresident -9223372036854775808\t"
+       "18446744073709551615 [a b]"},
       {C::PackageEnergyStatistics, {{"pkg_cany_residency", 987}}, "PackageEnergyStatistics\t987"},
       {C::DeviceChange,
        {{"deviceType", 3}, {"deviceName", "Magic Mouse"}, {"deviceId", "0x1234"}, {"nowConnected", 1}},

@@ -1,6 +1,10 @@
 #include <gtest/gtest.h>
 
+#include <climits>
+#include <cstdio>
+
 #include "base/Date.h"
+#include "base/DecimalText.h"
 #include "base/Duration.h"
 #include "base/Range.h"
 #include "base/Uuid.h"
@@ -86,6 +90,37 @@ TEST(Range, TouchingRangesIntersectInAnEmptyRangeAtTheTouchingPoint) {
   EXPECT_EQ(intersectionRange({15, 20}, {10, 10}), (Range{15, 5}));
   EXPECT_TRUE(Range({10, 5}).contains(10));
   EXPECT_FALSE(Range({10, 5}).contains(15));
+}
+
+// The hot text writers' integers print as printf prints them.
+TEST(DecimalText, MatchesPrintfForEveryWidthAndFlag) {
+  char expected[64];
+  for (int width : {0, 1, 2, 5, 8, 25, 60}) {
+    for (long long v : {0LL, 7LL, -7LL, 42LL, -42LL, 123456789LL, LLONG_MIN, LLONG_MAX}) {
+      std::string spaces, zeros, sign;
+      appendDecimal(spaces, v, width);
+      appendDecimal(zeros, v, width, DecimalPad::kZeros);
+      appendDecimal(sign, v, width, DecimalPad::kSignSpace);
+      std::snprintf(expected, sizeof expected, "%*lld", width, v);
+      EXPECT_EQ(spaces, expected);
+      std::snprintf(expected, sizeof expected, "%0*lld", width, v);
+      EXPECT_EQ(zeros, expected);
+      std::snprintf(expected, sizeof expected, "% *lld", width, v);
+      EXPECT_EQ(sign, expected);
+    }
+    for (unsigned long long v : {0ULL, 42ULL, ULLONG_MAX}) {
+      std::string spaces, zeros, sign;
+      appendDecimal(spaces, v, width);
+      appendDecimal(zeros, v, width, DecimalPad::kZeros);
+      appendDecimal(sign, v, width, DecimalPad::kSignSpace);
+      std::snprintf(expected, sizeof expected, "%*llu", width, v);
+      EXPECT_EQ(spaces, expected);
+      EXPECT_EQ(sign, expected);
+      std::snprintf(expected, sizeof expected, "%0*llu", width, v);
+      EXPECT_EQ(zeros, expected);
+    }
+  }
+  EXPECT_EQ(durationText(-4000), "00:00:-4");
 }
 
 }  // namespace
