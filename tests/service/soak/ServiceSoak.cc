@@ -14,7 +14,7 @@
 #include "base/Platform.h"
 #include "service/AnalysisService.h"
 #include "service/BusCodec.h"
-#include "service/PrivateBus.h"
+#include "support/PrivateBus.h"
 #include "service/ServiceStores.h"
 
 using namespace bw;
