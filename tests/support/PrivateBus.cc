@@ -21,18 +21,8 @@ bool PrivateBus::available() { return access("/usr/bin/dbus-daemon", X_OK) == 0;
 PrivateBus::PrivateBus(bool open) {
   chmod(dir_.path().c_str(), 0755);  // reachable for the clients that drop root
   const std::string socket = dir_ / "bus";
-  const std::string policy = open ? R"(
-  <policy context="default">
-    <allow user="*"/>
-    <allow own="*"/>
-    <allow send_type="method_call"/>
-    <allow send_type="signal"/>
-    <allow send_requested_reply="true"/>
-    <allow receive_type="method_call"/>
-    <allow receive_type="signal"/>
-    <allow receive_requested_reply="true"/>
-  </policy>)"
-                                  : R"(
+  // The later default policy of an open bus overrides the denials before it.
+  const std::string policy = R"(
   <policy context="default">
     <allow user="*"/>
     <deny own="*"/>
@@ -51,7 +41,13 @@ PrivateBus::PrivateBus(bool open) {
     <allow own="com.vexil.brindlewick.sampler"/>
   </policy>
   <include>)" + std::string(BRINDLEWICK_SOURCE_DIR) +
-                                        "/dist/com.vexil.brindlewick.analysis.conf</include>";
+                             "/dist/com.vexil.brindlewick.analysis.conf</include>" +
+                             (open ? R"(
+  <policy context="default">
+    <allow own="*"/>
+    <allow send_type="method_call"/>
+  </policy>)"
+                                   : "");
   dir_.write("bus.conf", R"(<!DOCTYPE busconfig PUBLIC "-//freedesktop//DTD D-Bus Bus Configuration 1.0//EN"
  "http://www.freedesktop.org/standards/dbus/1.0/busconfig.dtd">
 <busconfig>
