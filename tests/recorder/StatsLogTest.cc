@@ -6,13 +6,13 @@
 #include <fstream>
 
 #include "RecorderFixture.h"
-#include "support/Records.h"
 #include "Records/DateChange.h"
 #include "Records/LogStartsV1.h"
 #include "Records/TimeChange.h"
 #include "Records/UserIdle.h"
 #include "recorder/StatsLog.h"
 #include "store/StatsFileWriter.h"
+#include "support/Records.h"
 
 namespace bw::test {
 namespace {
