@@ -65,7 +65,7 @@ TEST_F(OptionValues, EachRangeOptionSetsItsDomainAndLaterOnesWinButDayFieldsStay
   for (const auto& c : cases) {
     const Parsed p = parse(c.args);
     EXPECT_EQ(p.status, 0);
-    EXPECT_EQ(domainOf(p.options), c.domain) << (c.args.empty() ? "" : c.args[0]);
+    EXPECT_EQ(domainOf(p.options), c.domain) << ::testing::PrintToString(c.args);
   }
   EXPECT_EQ(parse({}).options.mode(), kModeDashboard);
   EXPECT_EQ(parse({}).options.load_periodic_files_newer_than(), Date::distantPast());
