@@ -245,10 +245,11 @@ TEST_F(BusService, TheToolServesTheNameOnceAndIntrospects) {
   test::TempDir live;
   test::writeBatteryStore(live / "battery.stats", *platform().currentBootUuid(), version, start);
   const std::string dir = live.path();
-  ServiceProcess service(*bus, [dir] {
+  const auto tool = [dir] {
     execl(BRINDLEWICK_BINARY, "brindlewick", "--debug", "--xpc", "--from", dir.c_str(), static_cast<char*>(nullptr));
     return 127;
-  });
+  };
+  ServiceProcess service(*bus, tool);
   ASSERT_TRUE(service.running()) << service.err();
 
   test::RunSettings env;
@@ -266,14 +267,7 @@ TEST_F(BusService, TheToolServesTheNameOnceAndIntrospects) {
   EXPECT_NE(called.out.find("\"charge_levels\" ad 5 80 78 78 76 74 \"charge_times\" at 5 "), std::string::npos)
       << called.out << called.err;
 
-  ServiceProcess second(
-      *bus,
-      [dir] {
-        execl(BRINDLEWICK_BINARY, "brindlewick", "--debug", "--xpc", "--from", dir.c_str(),
-              static_cast<char*>(nullptr));
-        return 127;
-      },
-      false);
+  ServiceProcess second(*bus, tool, false);
   EXPECT_EQ(second.wait(), 1);
 
   test::ToolResult debug = test::runTool({"--xpc-debug", "--from", dir});
