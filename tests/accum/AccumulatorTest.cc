@@ -1,6 +1,8 @@
 // The accumulators by hand-computed examples: data sets and list statistics,
 // the interpolators (plain, increasing, sawtooth), the ledger of credits and
-// debits, and the per-boot hash factory, ledgers and interpolator sums.
+// debits, and the per-boot hash factory, ledgers and interpolator sums. Which
+// samples an interpolation uses is checked against plain scans in
+// ReferenceComparisonTest.
 #include <gtest/gtest.h>
 
 #include <limits>
@@ -82,26 +84,6 @@ TEST(DataSet, ValueAtPositionAnswersOnlyStoredPositionsAndRefusesPastTheEnd) {
   thrown([] { DataSet().minPosition(); }, kRangeException, "index 0 beyond bounds for empty list");
 }
 
-TEST(DataSet, DataPointsFollowTheRulesInOrder) {
-  const DataSet four = samples({{10, 1}, {20, 2}, {30, 3}, {40, 4}}), one = samples({{10, 1}}), none;
-  // The set, the position, the approach, hold, and the positions of the chosen samples.
-  const std::tuple<const DataSet&, std::uint64_t, std::int32_t, bool, std::vector<std::uint64_t>> cases[] = {
-      {four, 20, -1, false, {20}},     {four, 20, 1, false, {20}},      {four, 20, 0, true, {20}},
-      {four, 35, -1, false, {20, 30}}, {four, 45, -1, false, {30, 40}}, {four, 15, -1, true, {}},
-      {four, 5, -1, true, {}},         {four, 15, 0, false, {10, 20}},  {four, 5, 0, false, {}},
-      {four, 5, 0, true, {10}},        {four, 45, 0, true, {40}},       {four, 45, 0, false, {}},
-      {four, 15, 1, false, {20, 30}},  {four, 5, 1, false, {10, 20}},   {four, 35, 1, true, {}},
-      {four, 45, 1, true, {}},         {four, 45, -1, true, {30, 40}},  {one, 5, 1, true, {10}},
-      {one, 5, 1, false, {}},          {one, 20, -1, true, {10}},       {one, 5, -1, true, {}},
-      {none, 5, 0, true, {}}};
-  for (const auto& [set, p, approach, hold, expected] : cases) {
-    DataPoint points[2];
-    std::vector<std::uint64_t> chosen;
-    for (int i = 0, n = set.dataPoints(points, p, approach, hold); i < n; ++i) chosen.push_back(points[i].position);
-    EXPECT_EQ(chosen, expected) << set.count() << " samples, at " << p << " approach " << approach << " hold " << hold;
-  }
-}
-
 TEST(ListStatistics, SumMeanMedianMinMaxAndRanges) {
   const double kMax = std::numeric_limits<double>::max(), kInf = std::numeric_limits<double>::infinity();
   const std::pair<std::vector<double>, std::vector<double>> cases[] = {
@@ -152,19 +134,6 @@ TEST(Interpolator, ValuesAreLinearBetweenWholeNumberSamplesHeldOutsideAndExtrapo
   auto tooFew = series({{10, 100}, {20, 200}});  // without two samples from the position on, nothing is added
   tooFew.extrapolateValueAtPosition(15);
   EXPECT_EQ(tooFew.dataSet().count(), 2u);
-}
-
-TEST(Interpolator, InterpolatesAndExtrapolatesThroughTheChosenPoints) {
-  auto s = series({{10, 10}, {20, 20}, {30, 40}});  // slopes: 1 per unit from 10 to 20, 2 from 20 to 30
-  const std::tuple<std::uint64_t, std::int32_t, bool, double> cases[] = {
-      // position, approach, hold, value
-      {25, 0, false, 30},  {25, -1, false, 25},  // line through 10 and 20, extended
-      {25, 1, false, NAN}, {5, 1, false, 5},     // line through 10 and 20, backwards
-      {35, -1, false, 50}, {35, 0, false, NAN}, {35, 0, true, 40},
-      {15, -1, true, NAN}, {15, 1, true, 10},  // line through 20 and 30 at 15
-      {20, -1, false, 20}, {5, 0, true, 10},    {5, -1, true, NAN}};
-  for (auto [p, approach, hold, expected] : cases)
-    expectSame({s.interpolateValueAtPosition(p, approach, hold)}, {expected}, "at " + std::to_string(p));
 }
 
 TEST(IncreasingInterpolator, RefusesAFallingValueFirstThenAnEarlierPosition) {

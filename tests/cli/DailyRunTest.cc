@@ -2,9 +2,7 @@
 
 #include <filesystem>
 #include <fstream>
-#include <sstream>
 
-#include "base/Console.h"
 #include "base/RangeList.h"
 #include "cli/DailyRun.h"
 #include "cli/DailyStore.h"
@@ -13,7 +11,7 @@
 #include "model/Model.h"
 #include "reports/DailyReports.h"
 #include "store/PropertyListReader.h"
-#include "support/FakePlatform.h"
+#include "support/ConsoleCapture.h"
 #include "support/MachineFixture.h"
 #include "support/TempDir.h"
 
@@ -150,12 +148,9 @@ TEST_F(DailyRun, LastReportYesterdayReportsNothingAndLeavesTheStateFileAlone) {
 
   // A debug run reports today as well: nothing left only once today is.
   writeState({{"LastReportDate", Value(at(kJan1 + 3 * kDay))}});
-  std::ostringstream o, e;
-  setConsole(&o, &e);
-  gDebug = 1;
+  test::ConsoleCapture console;
   EXPECT_EQ(run(), std::vector<std::string>{});
-  setConsole(nullptr, nullptr);
-  EXPECT_NE(e.str().find("No dates to report - all done with daily report.\n"), std::string::npos) << e.str();
+  EXPECT_NE(console.err.str().find("No dates to report - all done with daily report.\n"), std::string::npos);
 }
 
 TEST_F(DailyRun, ABuildChangeReportsThePostInstallHourAndOlderBuildsGetNoTopEvents) {
@@ -184,16 +179,13 @@ TEST_F(DailyRun, ABuildChangeReportsThePostInstallHourAndOlderBuildsGetNoTopEven
 TEST_F(DailyRun, ADebugRunReportsTodayAndWritesNothing) {
   test::writeBoot(store / "a.stats", test::kBootA, "B2", kJan1, 30);
   now(kJan1 + 20 * kHour);
-  std::ostringstream o, e;
-  setConsole(&o, &e);
-  gDebug = 1;
-  std::vector<std::string> calls = run();
-  setConsole(nullptr, nullptr);
-  ASSERT_FALSE(calls.empty());
-  EXPECT_NE(e.str().find("Daily dates to report: (\n    2023-12-31,\n    2024-01-01\n)"), std::string::npos) << e.str();
-  EXPECT_NE(e.str().find("__saveLastReportYMD_block_invoke: 2024-01-01 00:00:00 +0000"), std::string::npos);
-  EXPECT_NE(e.str().find("__saveLastReportBuild_block_invoke: B2"), std::string::npos);
-  EXPECT_NE(o.str().find("===== Usage Summary (after) =====\n"), std::string::npos);
+  test::ConsoleCapture console;
+  ASSERT_FALSE(run().empty());
+  const std::string e = console.err.str();
+  EXPECT_NE(e.find("Daily dates to report: (\n    2023-12-31,\n    2024-01-01\n)"), std::string::npos) << e;
+  EXPECT_NE(e.find("__saveLastReportYMD_block_invoke: 2024-01-01 00:00:00 +0000"), std::string::npos);
+  EXPECT_NE(e.find("__saveLastReportBuild_block_invoke: B2"), std::string::npos);
+  EXPECT_NE(console.out.str().find("===== Usage Summary (after) =====\n"), std::string::npos);
   EXPECT_FALSE(std::filesystem::exists(stateFilePath()));
   EXPECT_FALSE(std::filesystem::exists(usageFilePath()));
 }

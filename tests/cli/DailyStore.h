@@ -3,8 +3,6 @@
 // whole days, so that day domains find them.
 #include <string>
 
-#include "Records/TimeChange.h"
-#include "Records/UserIdle.h"
 #include "cli/RecordModesStore.h"
 
 namespace bw::test {
@@ -18,18 +16,8 @@ inline void writeBoot(const std::string& path, const Uuid& boot, const std::stri
                       std::uint64_t hours, const Uuid* last = nullptr, const std::string& lastVersion = "") {
   StatsFileWriter w;
   w.append(logStart(boot, 1000, start, version, last, lastVersion));
-  TimeChange zone;
-  zone.setAbsoluteTime(1500);
-  zone.setWallTime(start + 500);
-  zone.setZoneName("UTC");
-  zone.setGmtoff(0);
-  w.append(zone);
-  for (std::uint64_t h = 1; h <= hours; ++h) {
-    UserIdle idle;
-    idle.setAbsoluteTime(1000 + h * kHour);
-    idle.setChange(h % 2);
-    w.append(idle);
-  }
+  w.append(zoneChange("UTC", 0, 1500, start + 500));
+  for (std::uint64_t h = 1; h <= hours; ++h) w.append(idle(1000 + h * kHour, h % 2));
   w.writeTo(path);
 }
 

@@ -2,12 +2,12 @@
 // a fixed clock.
 #include <gtest/gtest.h>
 
-#include <sstream>
+#include <tuple>
 #include <vector>
 
-#include "base/Console.h"
 #include "cli/OptionParser.h"
-#include "support/FakePlatform.h"
+#include "support/ConsoleCapture.h"
+#include "support/MachineFixture.h"
 
 namespace bw {
 namespace {
@@ -23,105 +23,61 @@ Parsed parse(std::vector<std::string> args) {
   std::vector<char*> argv;
   for (std::string& a : args) argv.push_back(a.data());
   argv.push_back(nullptr);
-  std::ostringstream o, e;
-  setConsole(&o, &e);
+  test::ConsoleCapture console(0);
   Parsed p;
   try {
     p.options = parseOptions(static_cast<int>(argv.size() - 1), argv.data());
   } catch (const ProcessExit& x) {
     p.status = x.status;
   }
-  setConsole(nullptr, nullptr);
-  p.err = e.str();
+  p.err = console.err.str();
   return p;
 }
 
-class OptionValues : public ::testing::Test {
- protected:
-  void SetUp() override {
-    setenv("TZ", "UTC", 1);
-    tzset();
-    gDebug = 0;
+class OptionValues : public test::MachineFixture {};
+
+// The domain as (type, start, end, year, month, day).
+using Domain = std::tuple<std::uint32_t, std::uint64_t, std::uint64_t, std::uint32_t, std::uint32_t, std::uint32_t>;
+Domain domainOf(const Options& o) {
+  return {o.domain_type(),     o.domain_start(),     o.domain_end(),
+          o.domain_ymd_year(), o.domain_ymd_month(), o.domain_ymd_day()};
+}
+
+TEST_F(OptionValues, EachRangeOptionSetsItsDomainAndLaterOnesWinButDayFieldsStay) {
+  constexpr std::uint64_t kNow = 1704110400123, kEver = ~std::uint64_t{0};  // 2024-01-01 12:00:00.123 UTC
+  constexpr std::uint64_t kJan2 = 1704164640000;                            // 2024-01-02 03:04:00 UTC
+  fake.nowMicros = static_cast<std::int64_t>(kNow) * 1000 + 456;
+  const struct {
+    std::vector<std::string> args;
+    Domain domain;
+  } cases[] = {
+      {{}, {kDomainAll, 0, kEver, 0, 0, 0}},
+      {{"-d", "20240230"}, {kDomainDate, 0, kEver, 2024, 2, 30}},  // impossible, but it reads back the same
+      {{"-d", "yesterday"}, {kDomainDate, 0, kEver, 2023, 12, 31}},
+      {{"--day", "current"}, {kDomainDate, 0, kEver, 2024, 1, 1}},
+      {{"-A", "1:30"}, {kDomainWallTime, kNow - 5400000, kNow, 0, 0, 0}},
+      {{"-A", "0:0:5"}, {kDomainWallTime, kNow - 5000, kNow, 0, 0, 0}},
+      {{"-R", "5000.1000"}, {kDomainRelative, 5000, 6000, 0, 0, 0}},
+      {{"-s", "2024-01-02 03:04:05"}, {kDomainWallTime, kJan2 + 50, kEver, 0, 0, 0}},  // the 05 is read as 0.05 s
+      {{"-e", "yesterday at noon"}, {kDomainWallTime, 0, 0, 0, 0, 0}},                 // unparsable
+      {{"-d", "20240105", "-s", "2024-01-02 03:04:00"}, {kDomainWallTime, kJan2, kEver, 2024, 1, 5}},
+  };
+  for (const auto& c : cases) {
+    const Parsed p = parse(c.args);
+    EXPECT_EQ(p.status, 0);
+    EXPECT_EQ(domainOf(p.options), c.domain) << ::testing::PrintToString(c.args);
   }
-  void TearDown() override { gDebug = 0; }
-  test::FakePlatform fake;
-};
-
-TEST_F(OptionValues, NothingGivenMeansDashboardOverEverything) {
-  Parsed p = parse({});
-  ASSERT_EQ(p.status, 0);
-  EXPECT_EQ(p.options.mode(), kModeDashboard);
-  EXPECT_EQ(p.options.domain_type(), kDomainAll);
-  EXPECT_EQ(p.options.domain_start(), 0u);
-  EXPECT_EQ(p.options.domain_end(), ~std::uint64_t{0});
-  EXPECT_EQ(p.options.load_periodic_files_newer_than(), Date::distantPast());
+  EXPECT_EQ(parse({}).options.mode(), kModeDashboard);
+  EXPECT_EQ(parse({}).options.load_periodic_files_newer_than(), Date::distantPast());
+  EXPECT_EQ(parse({"-s", "2024-01-02 03:04:05"}).options.load_periodic_files_newer_than(), Date{1704164640});
+  EXPECT_EQ(parse({"-d", "20240105", "-D", "-L"}).options.mode(), kModeListFiles);
 }
 
-TEST_F(OptionValues, DayKeepsAnImpossibleDateThatReadsBackTheSame) {
-  Parsed p = parse({"-d", "20240230"});
-  ASSERT_EQ(p.status, 0);
-  EXPECT_EQ(p.options.domain_type(), kDomainDate);
-  EXPECT_EQ(p.options.domain_ymd_year(), 2024u);
-  EXPECT_EQ(p.options.domain_ymd_month(), 2u);
-  EXPECT_EQ(p.options.domain_ymd_day(), 30u);
-}
-
-TEST_F(OptionValues, DayRefusesTextThatDoesNotReadBackTheSame) {
-  for (const char* bad : {"2024-1-1", "2024+101", "2024011", "202401011", "2024 101", "abcdefgh", "00000101"}) {
+TEST_F(OptionValues, RangesThatDoNotReadBackTheSameAreUsageErrors) {
+  for (const char* bad : {"2024-1-1", "2024+101", "2024011", "202401011", "2024 101", "abcdefgh", "00000101"})
     EXPECT_EQ(parse({"-d", bad}).status, 64) << bad;
-  }
-}
-
-TEST_F(OptionValues, YesterdayOnTheFirstOfJanuaryIsTheLastDayOfTheYearBefore) {
-  fake.nowMicros = 1704110400LL * 1000000;  // 2024-01-01 12:00:00 UTC
-  Parsed p = parse({"-d", "yesterday"});
-  ASSERT_EQ(p.status, 0);
-  EXPECT_EQ(p.options.domain_ymd_year(), 2023u);
-  EXPECT_EQ(p.options.domain_ymd_month(), 12u);
-  EXPECT_EQ(p.options.domain_ymd_day(), 31u);
-  Parsed today = parse({"--day", "current"});
-  EXPECT_EQ(today.options.domain_ymd_year(), 2024u);
-  EXPECT_EQ(today.options.domain_ymd_day(), 1u);
-}
-
-TEST_F(OptionValues, AgoCountsHoursMinutesAndSecondsBackFromNow) {
-  fake.nowMicros = 1700000000123456LL;
-  Parsed p = parse({"-A", "1:30"});
-  ASSERT_EQ(p.status, 0);
-  EXPECT_EQ(p.options.domain_type(), kDomainWallTime);
-  EXPECT_EQ(p.options.domain_end(), 1700000000123u);
-  EXPECT_EQ(p.options.domain_end() - p.options.domain_start(), 5400000u);
-  EXPECT_EQ(parse({"-A", "0:0:5"}).options.domain_start(), 1700000000123u - 5000u);
   for (const char* bad : {"0", "0:0", "1:2:3:4", "x"}) EXPECT_EQ(parse({"-A", bad}).status, 64) << bad;
-}
-
-TEST_F(OptionValues, DebugRangeIsAStartAndALength) {
-  Parsed p = parse({"-R", "5000.1000"});
-  ASSERT_EQ(p.status, 0);
-  EXPECT_EQ(p.options.domain_type(), kDomainRelative);
-  EXPECT_EQ(p.options.domain_start(), 5000u);
-  EXPECT_EQ(p.options.domain_end(), 6000u);
   for (const char* bad : {"5000", "5000.1000x", "5000,1000"}) EXPECT_EQ(parse({"-R", bad}).status, 64) << bad;
-}
-
-TEST_F(OptionValues, StartReadsItsLastFieldAsAFractionOfASecond) {
-  Parsed p = parse({"-s", "2024-01-02 03:04:05"});
-  ASSERT_EQ(p.status, 0);
-  EXPECT_EQ(p.options.domain_type(), kDomainWallTime);
-  EXPECT_EQ(p.options.domain_start() / 1000, 1704164640u);  // 03:04:00, the 05 is no whole seconds
-  EXPECT_EQ(p.options.domain_end(), ~std::uint64_t{0});
-  EXPECT_EQ(p.options.load_periodic_files_newer_than(), Date{1704164640});
-  Parsed unparsable = parse({"-e", "yesterday at noon"});
-  EXPECT_EQ(unparsable.options.domain_end(), 0u);
-  EXPECT_EQ(unparsable.options.domain_start(), 0u);
-}
-
-TEST_F(OptionValues, LaterOptionsWinButDayFieldsStay) {
-  Parsed p = parse({"-d", "20240105", "-s", "2024-01-02 03:04:00", "-D", "-L"});
-  ASSERT_EQ(p.status, 0);
-  EXPECT_EQ(p.options.domain_type(), kDomainWallTime);
-  EXPECT_EQ(p.options.domain_ymd_day(), 5u);
-  EXPECT_EQ(p.options.mode(), kModeListFiles);
 }
 
 TEST_F(OptionValues, BuildAndBootExcludeEachOther) {
@@ -178,16 +134,6 @@ TEST_F(OptionValues, DailyWithASampleRangeIsRefused) {
     EXPECT_EQ(p.status, 64) << range[0];
     EXPECT_EQ(p.err, "brindlewick: --daily mode should not have a specified domain\n");
   }
-}
-
-TEST_F(OptionValues, LocalRecordsNeedTheSuperUserButACopiedStoreDoesNot) {
-  fake.euid = 501;
-  Parsed local = parse({"-L"});
-  EXPECT_EQ(local.status, 77);
-  EXPECT_EQ(local.err,
-            "brindlewick: When reading the local machine's Brindlewick records, this program must be invoked as "
-            "the super-user.\n");
-  EXPECT_EQ(parse({"-L", "--from", "/x"}).status, 0);
 }
 
 }  // namespace

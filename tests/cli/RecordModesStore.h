@@ -46,10 +46,7 @@ inline void writeRecordModesStore(const TempDir& dir) {
 
   StatsFileWriter c1, c2;
   c1.append(logStart(kBootC, 100, kJan1 + 1800100, "21B5", &kBootB, "20A1"));
-  DeviceChange wifi = device(DeviceChange::kWiFi, 1, 200);
-  wifi.setDeviceName("Wi-Fi");
-  wifi.setDeviceId("wlan0");
-  c1.append(wifi);
+  c1.append(device(DeviceChange::kWiFi, 1, 200, "Wi-Fi", "wlan0"));
   c1.writeTo(dir.write("var/log/com.vexil.launchd/C1.stats"));
   c2.append(logStart(kBootC, 4000000, kJan1 + 5800000, "21B5", &kBootB, "20A1"));
   c2.append(idle(4000500, UserIdle::kActive));

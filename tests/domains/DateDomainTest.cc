@@ -8,7 +8,7 @@
 namespace bw {
 namespace {
 
-using test::DebugCapture;
+using test::ConsoleCapture;
 using test::feed;
 using test::idle;
 using test::zoneChange;
@@ -27,7 +27,7 @@ void feedAt(DateDomain& domain, const Record& r, std::uint64_t wallTime) {
 
 TEST(DateDomain, AZoneChangeFromPlusOneToPlusTwoMovesBothBoundsAnHourEarlier) {
   ASSERT_TRUE(test::kProcessZoneSet);
-  DebugCapture capture;
+  ConsoleCapture capture;
   DateDomain domain({2024, 1, 15});
   feedAt(domain, zoneChange("WAT", 3600), kLagosStart - 8'200'000);
   EXPECT_EQ(domain.start(), kLagosStart);
@@ -41,7 +41,7 @@ TEST(DateDomain, AZoneChangeFromPlusOneToPlusTwoMovesBothBoundsAnHourEarlier) {
   feedAt(domain, idle(), kHarareEnd);
   feedAt(domain, idle(), kHarareEnd + 1'000);  // past the Harare day, inside the Lagos one
   EXPECT_EQ(domain.ranges(), (Ranges{{12'201'000, 83'800'000}}));
-  EXPECT_EQ(capture.text(),
+  EXPECT_EQ(capture.err.str(),
             "Selecting events from 2024-01-15\n"
             "Time zone change! Now zone is Africa/Lagos. Adjusting start/end to 1705273200000-1705359600000\n"
             "Time zone change! Now zone is Africa/Harare. Adjusting start/end to 1705269600000-1705356000000\n");
@@ -58,7 +58,7 @@ TEST(DateDomain, SelectsNothingBeforeTheFirstTimeChange) {
 }
 
 TEST(DateDomain, UnknownAbbreviationAtOffsetZeroKeepsEmptyBounds) {
-  DebugCapture capture;
+  ConsoleCapture capture;
   DateDomain domain({2024, 1, 15});
   feedAt(domain, zoneChange("XYZ", 0), kLagosStart + 1'000);
   feedAt(domain, idle(), kLagosStart + 2'000);
@@ -67,17 +67,17 @@ TEST(DateDomain, UnknownAbbreviationAtOffsetZeroKeepsEmptyBounds) {
   EXPECT_EQ(domain.start(), 0u);
   EXPECT_EQ(domain.end(), 0u);
   EXPECT_TRUE(domain.ranges().empty());
-  EXPECT_EQ(capture.text(), "Selecting events from 2024-01-15\n");
+  EXPECT_EQ(capture.err.str(), "Selecting events from 2024-01-15\n");
 }
 
 TEST(DateDomain, UnknownAbbreviationTakesTheDayFromTheOffsetAcrossAMonthEnd) {
-  DebugCapture capture;
+  ConsoleCapture capture;
   DateDomain domain({2024, 1, 31});
   feed(domain, zoneChange("XYZ", 3600), 0, 1'706'655'000'000);
   EXPECT_EQ(domain.gmtoff(), 3600);
   EXPECT_EQ(domain.start(), 1'706'655'600'000u);  // 2024-01-30 23:00 UTC
   EXPECT_EQ(domain.end(), 1'706'742'000'000u);    // 2024-01-31 23:00 UTC
-  EXPECT_EQ(capture.text(),
+  EXPECT_EQ(capture.err.str(),
             "Selecting events from 2024-01-31\n"
             "Time zone change! Now offset is 3600. Adjusting start/end to 1706655600000-1706742000000\n");
 }

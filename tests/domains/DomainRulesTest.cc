@@ -91,12 +91,9 @@ TEST(BootDomain, SelectsTheGivenBootOrTheFirstOneSeen) {
   EXPECT_EQ(first.uuid(), a);
 }
 
-LogStartsV1 logStart(const char* system, const char* last) {
-  LogStartsV1 r;
-  r.setVersion("1");
-  if (system != nullptr) r.setSystemVersion(system);
-  if (last != nullptr) r.setLastSystemVersion(last);
-  return r;
+// A header of `system`, updated from `last` (none: absent).
+LogStartsV1 logStart(const char* system, const char* last = "") {
+  return test::logStart({}, 0, 0, system, nullptr, last);
 }
 
 TEST(PostInstallDomain, CoversTheFirstHourAfterAnUpdateOnce) {
@@ -118,9 +115,9 @@ TEST(PostInstallDomain, EndsAtTheNextBootAndTreatsAMissingPreviousVersionAsAnUpd
   const Uuid a = bootNamed(1), b = bootNamed(2);
   PostInstallDomain domain;
   feed(domain, idle(), 0, 0, {a, 0});
-  feed(domain, logStart("21B7", nullptr), 100, 0, {a, 100});
+  feed(domain, logStart("21B7"), 100, 0, {a, 100});
   feed(domain, idle(), 1'800'000, 0, {a, 1'800'000});
-  feed(domain, logStart("21B7", nullptr), 3'600'100, 0, {b, 0});
+  feed(domain, logStart("21B7"), 3'600'100, 0, {b, 0});
   EXPECT_EQ(domain.ranges(), (Ranges{{100, 3'600'000}}));
 }
 

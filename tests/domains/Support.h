@@ -1,15 +1,13 @@
 #pragma once
-// Feeding domains by hand, and a capture of standard
-// error with the debug flag set. The process zone is fixed before any test
-// runs, since the calendar reads it once.
+// Feeding domains by hand. The process zone is fixed before any test runs,
+// since the calendar reads it once.
 #include <cstdint>
 #include <cstdlib>
 #include <ctime>
-#include <sstream>
 #include <string>
 
-#include "base/Console.h"
 #include "domains/Domain.h"
+#include "support/ConsoleCapture.h"
 #include "support/Records.h"
 
 namespace bw::test {
@@ -27,22 +25,5 @@ inline void feed(Domain& domain, const Record& r, std::uint64_t position, std::u
                  const AbsTime& t = AbsTime{}) {
   domain.addEvent(r, position, t, wallTime);
 }
-
-// Sets the debug flag and collects standard error while alive.
-class DebugCapture {
- public:
-  DebugCapture() {
-    gDebug = 1;
-    setConsole(nullptr, &err_);
-  }
-  ~DebugCapture() {
-    gDebug = 0;
-    setConsole(nullptr, nullptr);
-  }
-  std::string text() const { return err_.str(); }
-
- private:
-  std::ostringstream err_;
-};
 
 }  // namespace bw::test

@@ -23,106 +23,64 @@ struct IdleSummarizer : Summarizer {
   }
 };
 
-TEST(Summarizer, AnswersOpenAndCloseOneRangeUnlessRangesAreDiscrete) {
-  IdleSummarizer plain;
-  plain.feed(10, 1);
-  plain.feed(20, 1);
-  plain.feed(30, 0);
-  EXPECT_EQ(plain.ranges(), (std::vector<Range>{{10, 20}}));
+using Ranges = std::vector<Range>;
 
-  IdleSummarizer discrete;
-  discrete.setDiscreteRanges(true);
-  discrete.feed(10, 1);
-  discrete.feed(20, 1);
-  discrete.feed(30, 0);
-  EXPECT_EQ(discrete.ranges(), (std::vector<Range>{{10, 10}, {20, 10}}));
-}
+// What a test feeds: a UserIdle answer, or a sleep, wake or dark wake record (another
+// class, which the handler never sees).
+enum Event : std::uint32_t { kEnd = 0, kHold = 1, kSleep = 100, kWake = 101, kDarkWake = 102, kNo = 0xFFFFFFFF };
+struct Fed {
+  std::uint64_t position;
+  std::uint32_t event;
+  const Uuid& boot = kBoot1;
+};
+enum Flag : unsigned { kDiscrete = 1, kStartAtBoot = 2, kEndAtShutdown = 4, kResetAtReboot = 8, kEndAtSleep = 16 };
+constexpr std::uint64_t kNone = 0;  // no last position set
 
-TEST(Summarizer, NoChangeAnswersAndOtherClassesLeaveTheStateAlone) {
-  IdleSummarizer s;
-  s.feed(10, 1);
-  s.feed(20, 0xFFFFFFFF);
-  SleepWake sleep;
-  s.addEvent(sleep, 25, AbsTime::timeWithBoot(kBoot1, 25), 0);
-  s.feed(30, 0);
-  EXPECT_EQ(s.ranges(), (std::vector<Range>{{10, 20}}));
-}
-
-TEST(Summarizer, AnEndAtTheOpenRangesStartKeepsItOpen) {
-  IdleSummarizer s;
-  s.feed(10, 1);
-  s.feed(10, 0);
-  EXPECT_TRUE(s.ranges().empty());
-  s.feed(15, 0);
-  EXPECT_EQ(s.ranges(), (std::vector<Range>{{10, 5}}));
-}
-
-TEST(Summarizer, TheLastPositionClosesAnOpenRangeOnlyWithoutDiscreteRanges) {
-  IdleSummarizer plain;
-  plain.feed(10, 1);
-  plain.setLastPosition(50);
-  EXPECT_EQ(plain.ranges(), (std::vector<Range>{{10, 40}}));
-
-  IdleSummarizer discrete;
-  discrete.setDiscreteRanges(true);
-  discrete.feed(10, 1);
-  discrete.feed(20, 1);
-  discrete.setLastPosition(50);
-  EXPECT_EQ(discrete.ranges(), (std::vector<Range>{{10, 10}}));
-
-  IdleSummarizer closed;  // a range ended since the last begin is not reopened
-  closed.feed(10, 1);
-  closed.feed(20, 0);
-  closed.setLastPosition(50);
-  EXPECT_EQ(closed.ranges(), (std::vector<Range>{{10, 10}}));
-}
-
-TEST(Summarizer, BootFlagsCoverEachBootFromItsFirstToItsLastRecord) {
-  IdleSummarizer s;
-  s.setStartAtBoot(true);
-  s.setEndAtShutdown(true);
-  s.setResetAtReboot(true);
-  SleepWake other;  // not accepted: only the boot handling acts
-  auto feed = [&](std::uint64_t p, const Uuid& boot) { s.addEvent(other, p, AbsTime::timeWithBoot(boot, p), 0); };
-  feed(0, kBoot1);
-  feed(5, kBoot1);
-  feed(9, kBoot1);
-  feed(100, kBoot2);  // a boot of a single record yields no range
-  feed(200, kBoot1);
-  feed(250, kBoot1);
-  s.setLastPosition(250);
-  EXPECT_EQ(s.ranges(), (std::vector<Range>{{0, 9}, {200, 50}}));
-}
-
-TEST(Summarizer, ARebootDropsAnOpenRangeUnlessShutdownEndsItFirst) {
-  IdleSummarizer reset;
-  reset.setResetAtReboot(true);
-  reset.feed(10, 1);
-  reset.feed(20, 0xFFFFFFFF);
-  reset.feed(100, 0xFFFFFFFF, kBoot2);
-  reset.setLastPosition(150);
-  EXPECT_TRUE(reset.ranges().empty());
-
-  IdleSummarizer both;
-  both.setResetAtReboot(true);
-  both.setEndAtShutdown(true);
-  both.feed(10, 1);
-  both.feed(20, 0xFFFFFFFF);
-  both.feed(100, 0xFFFFFFFF, kBoot2);
-  EXPECT_EQ(both.ranges(), (std::vector<Range>{{10, 10}}));
-}
-
-TEST(Summarizer, EndAtSleepClosesTheRangeAtASleep) {
-  IdleSummarizer s;
-  s.setEndAtSleep(true);
-  s.feed(10, 1);
-  SleepWake wake;
-  wake.setReason(1);
-  s.addEvent(wake, 20, AbsTime::timeWithBoot(kBoot1, 20), 0);
-  SleepWake sleep;
-  sleep.setReason(0);
-  s.addEvent(sleep, 30, AbsTime::timeWithBoot(kBoot1, 30), 0);
-  EXPECT_EQ(s.ranges(), (std::vector<Range>{{10, 20}}));
+TEST(Summarizer, RangesFollowTheAnswersTheBootsSleepsAndTheLastPositionAsTheFlagsSay) {
+  const struct {
+    const char* what;
+    unsigned flags;
+    std::vector<Fed> events;
+    std::uint64_t last;
+    Ranges expected;
+  } cases[] = {
+      {"one range", 0, {{10, kHold}, {20, kHold}, {30, kEnd}}, kNone, {{10, 20}}},
+      {"discrete", kDiscrete, {{10, kHold}, {20, kHold}, {30, kEnd}}, kNone, {{10, 10}, {20, 10}}},
+      {"no change, other class", 0, {{10, kHold}, {20, kNo}, {25, kSleep}, {30, kEnd}}, kNone, {{10, 20}}},
+      {"end at the open start", 0, {{10, kHold}, {10, kEnd}}, kNone, {}},
+      {"a later end", 0, {{10, kHold}, {10, kEnd}, {15, kEnd}}, kNone, {{10, 5}}},
+      {"last position closes", 0, {{10, kHold}}, 50, {{10, 40}}},
+      {"not a discrete one", kDiscrete, {{10, kHold}, {20, kHold}}, 50, {{10, 10}}},
+      {"closed stays closed", 0, {{10, kHold}, {20, kEnd}}, 50, {{10, 10}}},
+      // Each boot from its first to its last record; a boot of one record has none.
+      {"boot flags",
+       kStartAtBoot | kEndAtShutdown | kResetAtReboot,
+       {{0, kSleep}, {5, kSleep}, {9, kSleep}, {100, kSleep, kBoot2}, {200, kSleep}, {250, kSleep}},
+       250,
+       {{0, 9}, {200, 50}}},
+      {"reboot drops", kResetAtReboot, {{10, kHold}, {20, kNo}, {100, kNo, kBoot2}}, 150, {}},
+      {"shutdown ends first",
+       kEndAtShutdown | kResetAtReboot,
+       {{10, kHold}, {20, kNo}, {100, kNo, kBoot2}},
+       kNone,
+       {{10, 10}}},
+      {"end at sleep", kEndAtSleep, {{10, kHold}, {15, kDarkWake}, {20, kWake}, {30, kSleep}}, kNone, {{10, 20}}},
+  };
+  for (const auto& c : cases) {
+    IdleSummarizer s;
+    s.setDiscreteRanges(c.flags & kDiscrete), s.setStartAtBoot(c.flags & kStartAtBoot);
+    s.setEndAtShutdown(c.flags & kEndAtShutdown), s.setResetAtReboot(c.flags & kResetAtReboot);
+    s.setEndAtSleep(c.flags & kEndAtSleep);
+    for (const Fed& e : c.events) {
+      if (e.event >= kSleep && e.event <= kDarkWake) {
+        s.addEvent(test::sleepWake(0, 0, e.event - kSleep), e.position, AbsTime::timeWithBoot(e.boot, e.position), 0);
+      } else {
+        s.feed(e.position, e.event, e.boot);
+      }
+    }
+    if (c.last != kNone) s.setLastPosition(c.last);
+    EXPECT_EQ(s.ranges(), c.expected) << c.what;
+  }
 }
 
 struct CountingContext : SummarizerContext {

@@ -20,14 +20,6 @@ using test::kBootB;
 using test::kJan1;
 const std::vector<Range> kEverything = {{0, std::uint64_t{1} << 40}};
 
-PowerStateChange power(std::uint64_t abs, std::uint64_t wallBase, std::uint64_t change) {
-  PowerStateChange p;
-  p.setAbsoluteTime(abs);
-  p.setWallTime(wallBase + abs);
-  p.setChange(change);
-  return p;
-}
-
 // Boot A: on A/C until 3 minutes; package residency rises 0.5 per ms until
 // its first sample at 1 minute, then 0.9, 0.5, 0.3 and 0.8 per ms over the
 // next four minutes, then a sample 59,999 ms later. Boot B (after A): on A/C
@@ -39,16 +31,16 @@ class CPUAndIOQueries : public ::testing::Test {
     const std::uint64_t wallA = kJan1, wallB = kJan1 + 3600000;
     StatsFileWriter a;
     a.append(test::logStart(kBootA, 1000, wallA + 1000, "20A1", nullptr));
-    a.append(power(1000, wallA, 0));
+    a.append(test::powerChange(0, 1000, wallA + 1000));
     const std::uint64_t canyA[] = {30000, 84000, 114000, 132000, 180000, 180000};
     for (int k = 0; k < 6; ++k) a.append(test::packageSample(60000 * (k + 1) - (k == 5 ? 1 : 0), canyA[k]));
-    a.append(power(180000, wallA, 1));
+    a.append(test::powerChange(1, 180000, wallA + 180000));
     a.append(test::diskRead(1000, 0)), a.append(test::diskRead(61000, 500)), a.append(test::diskRead(121000, 5500));
     a.writeTo(dir.write("var/db/brindlewick/A.stats"));
 
     StatsFileWriter b;
     b.append(test::logStart(kBootB, 500, wallB + 500, "20A1", &kBootA, "20A1"));
-    b.append(power(500, wallB, 0));
+    b.append(test::powerChange(0, 500, wallB + 500));
     b.append(test::packageSample(60000, 6000)), b.append(test::packageSample(180000, 114000));
     b.append(test::diskRead(500, 0)), b.append(test::diskRead(60500, 2000));
     b.writeTo(dir.write("var/db/brindlewick/B.stats"));

@@ -1,11 +1,10 @@
 #include <gtest/gtest.h>
 
-#include "Records/LogStartsV1.h"
 #include "model/Model.h"
 #include "model/ModelUsage.h"
 #include "summarizers/ProcessRecords.h"
 #include "summarizers/ProcessSummarizer.h"
-#include "time/BootTimeline.h"
+#include "summarizers/ResourceModel.h"
 
 namespace bw {
 namespace {
@@ -16,29 +15,20 @@ using test::Sample;
 // from 1500 to 2000.
 class ModelProcesses : public ::testing::Test {
  protected:
-  ModelProcesses() {
-    header.setVersion("1");
-    header.setAbsoluteTime(0);
-    header.setWallTime(BootTimeline::kClockSetWallTime + 1000000);
-    header.setSystemVersion("23A344");
+  static std::vector<std::unique_ptr<Record>> records() {
+    std::vector<std::unique_ptr<Record>> records;
     for (const Sample& s : {
              Sample{.uniqueid = 10, .at = 1000, .name = "App", .responsible = 10, .cpuMs = 10},
              Sample{.uniqueid = 11, .at = 2000, .status = 0, .name = "tool", .parent = 10, .cpuMs = 5, .start = 1500},
              Sample{.uniqueid = 10, .at = 3000, .status = 0, .name = "App", .responsible = 10, .cpuMs = 30},
          })
-      usages.push_back(test::processUsage(s));
-    std::vector<RecordRef> records{&header};
-    for (ProcessUsage& u : usages) records.push_back(&u);
-    std::vector<std::unique_ptr<Timeline>> boots;
-    boots.push_back(std::make_unique<BootTimeline>(test::boot(1), records));
-    model = std::make_unique<Model>(Timeline::timelineWithTimelines(std::move(boots)), "23A344");
-    model->processEventsWithDomains({}, true);
+      records.push_back(std::make_unique<ProcessUsage>(test::processUsage(s)));
+    return records;
   }
   double cpuMs(const ProcessSummary& root, const char* job) { return root.subprocesses().at(job)->cpuTime() / 1e6; }
 
-  LogStartsV1 header;
-  std::vector<ProcessUsage> usages;
-  std::unique_ptr<Model> model;
+  test::ResourceModel built{records()};
+  Model* model = &built.model();
 };
 
 TEST_F(ModelProcesses, TheThreeOperationsSummarizeJobsOverRelativeAndAbsoluteRanges) {
@@ -59,7 +49,7 @@ TEST_F(ModelProcesses, TheThreeOperationsSummarizeJobsOverRelativeAndAbsoluteRan
   EXPECT_EQ(relative.spawns(), 1);        // the tool
 
   ProcessSummary absolute;
-  model->summarizeProcesses(absolute, false, AbsRange::rangeWithBoot(test::boot(1), 0, 1000));
+  model->summarizeProcesses(absolute, false, AbsRange::rangeWithBoot(test::bootNamed(7), 0, 1000));
   EXPECT_EQ(cpuMs(absolute, "App"), 10);
   EXPECT_EQ(cpuMs(absolute, "tool"), 0);
   EXPECT_EQ(absolute.stillrunning(), 1u);
@@ -78,7 +68,7 @@ TEST_F(ModelProcesses, UsageCountsEveryProcessOnceUnderTheJobThatRunsIt) {
     }
   }
   EXPECT_DOUBLE_EQ(jobSeconds, 0.035);
-  EXPECT_EQ(ModelUsageInputs(*model).build(), "23A344");
+  EXPECT_EQ(ModelUsageInputs(*model).build(), "22A100");
 }
 
 }  // namespace

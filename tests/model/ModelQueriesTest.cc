@@ -2,8 +2,8 @@
 
 #include <functional>
 
-#include "base/Exception.h"
 #include "model/Model.h"
+#include "support/Thrown.h"
 
 namespace bw {
 namespace {
@@ -52,30 +52,15 @@ TEST_F(ModelQueries, KeysIntersectTheirStatesWithinTheGivenRanges) {
 }
 
 TEST_F(ModelQueries, AnUnknownKeyIsAnInvalidArgumentForEveryQuery) {
-  const std::function<void()> queries[] = {
-      [&] {
-        model.rangesForSubstates({"Even", "Nope"}, std::nullopt);
-      },
-      [&] {
-        model.summarize("Nope", Range{0, 1});
-      },
-      [&] {
-        model.summarize("Nope", std::vector<Range>{{0, 1}});
-      },
-      [&] {
-        model.summarizeTop("Nope", {{0, 1}}, [](const Summary&) { return true; });
-      },
-  };
-  for (const auto& query : queries) {
-    try {
-      query();
-      ADD_FAILURE() << "no exception";
-    } catch (const Exception& e) {
-      EXPECT_EQ(e.name(), kInvalidArgumentException);
-      EXPECT_EQ(e.reason(), "no such summarizer: Nope");
-      EXPECT_TRUE(e.userInfo().empty());
+  const auto refused = [](const std::function<void()>& query) {
+    if (auto e = test::thrown(query, kInvalidArgumentException, "no such summarizer: Nope")) {
+      EXPECT_TRUE(e->userInfo().empty());
     }
-  }
+  };
+  refused([&] { model.rangesForSubstates({"Even", "Nope"}, std::nullopt); });
+  refused([&] { model.summarize("Nope", Range{0, 1}); });
+  refused([&] { model.summarize("Nope", std::vector<Range>{{0, 1}}); });
+  refused([&] { model.summarizeTop("Nope", {{0, 1}}, [](const Summary&) { return true; }); });
 }
 
 TEST_F(ModelQueries, SummarizeAccumulatesOverRangesAndEndsAtTheLast) {

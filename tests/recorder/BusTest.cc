@@ -7,73 +7,19 @@
 #include <systemd/sd-bus.h>
 #include <unistd.h>
 
-#include <cstdlib>
 #include <functional>
+#include <memory>
 
 #include "RecorderFixture.h"
 #include "Records/ProcessUsage.h"
 #include "Records/SleepWake.h"
 #include "Records/UserIdle.h"
+#include "support/PrivateBus.h"
 
 namespace bw::test {
 namespace {
 
 constexpr const char* kSessionPath = "/org/freedesktop/login1/session/_31";
-
-std::string findDaemon() {
-  for (const char* dir : {"/usr/bin", "/bin", "/usr/local/bin"}) {
-    const std::string path = std::string(dir) + "/dbus-daemon";
-    if (::access(path.c_str(), X_OK) == 0) return path;
-  }
-  return "";
-}
-
-// A bus of its own: any name may be owned, anything sent.
-struct PrivateBus {
-  TempDir dir;
-  pid_t pid = -1;
-  std::string address;
-
-  explicit PrivateBus(const std::string& daemon) {
-    const std::string config = dir.write("bus.conf", R"(<!DOCTYPE busconfig PUBLIC
- "-//freedesktop//DTD D-Bus Bus Configuration 1.0//EN"
- "http://www.freedesktop.org/standards/dbus/1.0/busconfig.dtd">
-<busconfig>
-  <listen>unix:path=)" + dir.path() + R"(/socket</listen>
-  <auth>EXTERNAL</auth>
-  <policy context="default">
-    <allow user="*"/>
-    <allow own="*"/>
-    <allow send_type="method_call"/>
-    <allow send_type="signal"/>
-    <allow send_requested_reply="true"/>
-    <allow receive_type="method_call"/>
-    <allow receive_type="signal"/>
-    <allow receive_requested_reply="true"/>
-  </policy>
-</busconfig>
-)");
-    int out[2];
-    if (::pipe(out) != 0) return;
-    pid = fork();
-    if (pid == 0) {
-      dup2(out[1], STDOUT_FILENO);
-      execl(daemon.c_str(), "dbus-daemon", ("--config-file=" + config).c_str(), "--nofork", "--print-address",
-            static_cast<char*>(nullptr));
-      _exit(127);
-    }
-    ::close(out[1]);
-    char c;
-    while (::read(out[0], &c, 1) == 1 && c != '\n') address += c;
-    ::close(out[0]);
-  }
-  ~PrivateBus() {
-    if (pid > 0) {
-      ::kill(pid, SIGTERM);
-      ::waitpid(pid, nullptr, 0);
-    }
-  }
-};
 
 // logind as far as the recorder uses it: Inhibit, PrepareForSleep, the seat's
 // active session and its type and idle hint.
@@ -111,7 +57,7 @@ struct FakeLogind {
     return 0;
   }
 
-  bool connect(const std::string& address) {
+  bool connect(const PrivateBus& privateBus) {
     static const sd_bus_vtable manager[] = {SD_BUS_VTABLE_START(0),
                                             SD_BUS_METHOD("Inhibit", "ssss", "h", inhibit, SD_BUS_VTABLE_UNPRIVILEGED),
                                             SD_BUS_SIGNAL("PrepareForSleep", "b", 0), SD_BUS_VTABLE_END};
@@ -120,9 +66,8 @@ struct FakeLogind {
     static const sd_bus_vtable session[] = {
         SD_BUS_VTABLE_START(0), SD_BUS_PROPERTY("Type", "s", sessionType, 0, 0),
         SD_BUS_PROPERTY("IdleHint", "b", idleHint, 0, SD_BUS_VTABLE_PROPERTY_EMITS_CHANGE), SD_BUS_VTABLE_END};
-    return sd_bus_new(&bus) >= 0 && sd_bus_set_address(bus, address.c_str()) >= 0 &&
-           sd_bus_set_bus_client(bus, 1) >= 0 && sd_bus_negotiate_fds(bus, 1) >= 0 && sd_bus_start(bus) >= 0 &&
-           sd_bus_add_object_vtable(bus, nullptr, "/org/freedesktop/login1", "org.freedesktop.login1.Manager", manager,
+    bus = privateBus.connect();
+    return sd_bus_add_object_vtable(bus, nullptr, "/org/freedesktop/login1", "org.freedesktop.login1.Manager", manager,
                                     this) >= 0 &&
            sd_bus_add_object_vtable(bus, nullptr, "/org/freedesktop/login1/seat/seat0", "org.freedesktop.login1.Seat",
                                     seat, this) >= 0 &&
@@ -154,21 +99,23 @@ struct FakeLogind {
 };
 
 TEST(RecorderBus, SleepWakeIdleAndTheSamplerThroughLogindOnAPrivateBus) {
-  const std::string daemon = findDaemon();
-  if (daemon.empty()) GTEST_SKIP() << "dbus-daemon is not installed";
-  PrivateBus privateBus(daemon);
-  ASSERT_FALSE(privateBus.address.empty());
+  if (!PrivateBus::available()) GTEST_SKIP() << "dbus-daemon is not installed";
+  PrivateBus privateBus(/*open=*/true);
   FakeLogind logind;
-  ASSERT_TRUE(logind.connect(privateBus.address));
+  ASSERT_TRUE(logind.connect(privateBus));
 
   TempDir store;
   const pid_t recorder = fork();
   if (recorder == 0) {
-    setenv("DBUS_SYSTEM_BUS_ADDRESS", privateBus.address.c_str(), 1);
+    setenv("DBUS_SYSTEM_BUS_ADDRESS", privateBus.address().c_str(), 1);
     execl(BRINDLEWICK_RECORDER_BINARY, "brindlewick-recorder", "--store", store.path().c_str(), "--interval", "0.2",
           "--process-every", "100000", static_cast<char*>(nullptr));
     _exit(127);
   }
+  // A failed assertion below still stops the recorder.
+  std::unique_ptr<const pid_t, void (*)(const pid_t*)> stopper(&recorder, [](const pid_t* pid) {
+    if (::waitpid(*pid, nullptr, WNOHANG) == 0) ::kill(*pid, SIGKILL), ::waitpid(*pid, nullptr, 0);
+  });
   const auto count = [&]<class T>(T*, auto predicate) {
     const StoreContents contents(store.path());
     std::size_t n = 0;

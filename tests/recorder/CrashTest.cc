@@ -17,7 +17,15 @@
 namespace bw::test {
 namespace {
 
+std::size_t countFiles(const std::string& dir) {
+  std::size_t n = 0;
+  for (const auto& e : std::filesystem::directory_iterator(dir)) n += e.path().extension() == ".stats";
+  return n;
+}
+
+// Starts the recorder and waits until it has begun its file.
 pid_t startRecorder(const std::string& store) {
+  const std::size_t before = countFiles(store);
   const pid_t pid = fork();
   if (pid == 0) {
     const int null = ::open("/dev/null", O_WRONLY);
@@ -27,13 +35,8 @@ pid_t startRecorder(const std::string& store) {
           "--process-every", "2", "--rotate", "0.5", "--no-bus", static_cast<char*>(nullptr));
     _exit(127);
   }
+  for (int wait = 0; wait < 5000 && countFiles(store) == before; ++wait) ::usleep(1000);
   return pid;
-}
-
-std::size_t countFiles(const std::string& dir) {
-  std::size_t n = 0;
-  for (const auto& e : std::filesystem::directory_iterator(dir)) n += e.path().extension() == ".stats";
-  return n;
 }
 
 struct FileCheck {
@@ -72,11 +75,9 @@ TEST(RecorderCrash, SigkillWhileWritingLosesAtMostTheLastRecord) {
   int kills = 0, tornFiles = 0, unreadableBeforeRepair = 0;
   std::uint64_t tornBytes = 0;
   for (int i = 0; i < rounds; ++i) {
-    const std::size_t before = countFiles(store.path());
     const pid_t pid = startRecorder(store.path());
     ASSERT_GT(pid, 0);
-    // Once it has begun its file, kill it anywhere in what it writes next.
-    for (int wait = 0; wait < 5000 && countFiles(store.path()) == before; ++wait) ::usleep(1000);
+    // Kill it anywhere in what it writes next.
     ::usleep(static_cast<useconds_t>(delayUs(random)));
     ::kill(pid, SIGKILL);
     int status = 0;
@@ -97,9 +98,7 @@ TEST(RecorderCrash, SigkillWhileWritingLosesAtMostTheLastRecord) {
     }
   }
   // One last start repairs what the last kill left, and stops cleanly.
-  const std::size_t before = countFiles(store.path());
   const pid_t last = startRecorder(store.path());
-  for (int wait = 0; wait < 5000 && countFiles(store.path()) == before; ++wait) ::usleep(1000);
   ::kill(last, SIGTERM);
   int status = 0;
   ::waitpid(last, &status, 0);

@@ -7,39 +7,22 @@
 #include "Records/DisplayBrightness.h"
 #include "Records/FanState.h"
 #include "Records/ProcessUsage.h"
-#include "recorder/Recorder.h"
 
 namespace bw::test {
 namespace {
 
-struct Rig {
-  MachineTree tree;
-  TempDir store;
-  FakeClock clock;
-  recorder::MachineFiles machine{tree.dir.path()};
-  recorder::StatsLog log{store.path(),
-                         recorder::BootIdentity{*Uuid::parse("11111111-2222-3333-4444-555555555555"), "6.1.0"}, clock};
-  recorder::Recorder recorder{machine, clock, log, 1000};
-
-  Rig() { EXPECT_TRUE(log.start()); }
-  StoreContents contents() {
-    log.flush();
-    return StoreContents(store.path());
-  }
-
-  // A process as /proc shows it: stat (start in clock ticks), status, cgroup, exe.
-  void process(std::uint64_t pid, const std::string& comm, std::uint64_t ppid, std::uint64_t start,
-               const std::string& cgroup, const std::string& exe, std::uint64_t utime = 0) const {
-    const std::string dir = "/proc/" + std::to_string(pid) + "/";
-    tree.put(dir + "stat", std::to_string(pid) + " (" + comm + ") S " + std::to_string(ppid) + " 0 0 0 -1 0 0 0 7 0 " +
-                               std::to_string(utime) + " 3 0 0 20 0 1 0 " + std::to_string(start) + " 0 0\n");
-    tree.put(dir + "status", "Name:\t" + comm +
-                                 "\nUid:\t1000\t1000\t1000\t1000\nVmRSS:\t    2048 kB\n"
-                                 "RssAnon:\t    1024 kB\nVmSwap:\t      16 kB\n");
-    tree.put(dir + "cgroup", "0::" + cgroup + "\n");
-    if (!exe.empty()) tree.symlink(dir + "exe", exe);
-  }
-};
+// A process as /proc shows it: stat (start in clock ticks), status, cgroup, exe.
+void process(const MachineTree& tree, std::uint64_t pid, const std::string& comm, std::uint64_t ppid,
+             std::uint64_t start, const std::string& cgroup, const std::string& exe, std::uint64_t utime = 0) {
+  const std::string dir = "/proc/" + std::to_string(pid) + "/";
+  tree.put(dir + "stat", std::to_string(pid) + " (" + comm + ") S " + std::to_string(ppid) + " 0 0 0 -1 0 0 0 7 0 " +
+                             std::to_string(utime) + " 3 0 0 20 0 1 0 " + std::to_string(start) + " 0 0\n");
+  tree.put(dir + "status", "Name:\t" + comm +
+                               "\nUid:\t1000\t1000\t1000\t1000\nVmRSS:\t    2048 kB\n"
+                               "RssAnon:\t    1024 kB\nVmSwap:\t      16 kB\n");
+  tree.put(dir + "cgroup", "0::" + cgroup + "\n");
+  if (!exe.empty()) tree.symlink(dir + "exe", exe);
+}
 
 std::uint64_t idOf(std::uint64_t pid, std::uint64_t start) { return pid == 1 ? 1 : start << 22 | pid; }
 
@@ -53,16 +36,16 @@ const ProcessUsage* find(const std::vector<const ProcessUsage*>& records, std::u
 TEST(RecorderProcesses, AppearForkAndExitWithServiceManagersNamedForTheJobRules) {
   Rig rig;
   const std::string user = "/user.slice/user-1000.slice/user@1000.service";
-  rig.process(1, "systemd", 0, 1, "/init.scope", "/usr/lib/systemd/systemd");
-  rig.process(2, "kthreadd", 0, 1, "/", "");
-  rig.process(800, "systemd", 1, 40, user + "/init.scope", "/usr/lib/systemd/systemd");
-  rig.process(900, "sshd", 1, 50, "/system.slice/ssh.service", "/usr/sbin/sshd", 25);
-  rig.process(901, "sshd", 900, 60, "/system.slice/ssh.service", "/usr/sbin/sshd (deleted)");
-  rig.process(950, "pipewire", 800, 55, user + "/session.slice/pipewire.service", "/usr/bin/pipewire");
+  process(rig.tree, 1, "systemd", 0, 1, "/init.scope", "/usr/lib/systemd/systemd");
+  process(rig.tree, 2, "kthreadd", 0, 1, "/", "");
+  process(rig.tree, 800, "systemd", 1, 40, user + "/init.scope", "/usr/lib/systemd/systemd");
+  process(rig.tree, 900, "sshd", 1, 50, "/system.slice/ssh.service", "/usr/sbin/sshd", 25);
+  process(rig.tree, 901, "sshd", 900, 60, "/system.slice/ssh.service", "/usr/sbin/sshd (deleted)");
+  process(rig.tree, 950, "pipewire", 800, 55, user + "/session.slice/pipewire.service", "/usr/bin/pipewire");
   rig.recorder.begin();
 
   rig.clock.advance(10000);
-  rig.process(902, "sshd", 900, 70, "/system.slice/ssh.service", "/usr/sbin/sshd");  // a fork
+  process(rig.tree, 902, "sshd", 900, 70, "/system.slice/ssh.service", "/usr/sbin/sshd");  // a fork
   rig.recorder.sampleProcesses();
   rig.clock.advance(10000);
   rig.tree.remove("/proc/901");

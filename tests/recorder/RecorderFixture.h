@@ -11,6 +11,7 @@
 
 #include "Records/RecordDecoder.h"
 #include "recorder/Clock.h"
+#include "recorder/Recorder.h"
 #include "store/RecordReader.h"
 #include "store/StoreQuery.h"
 #include "support/TempDir.h"
@@ -75,6 +76,23 @@ struct StoreContents {
       if (const T* t = recordCast<T>(r)) out.push_back(t);
     }
     return out;
+  }
+};
+
+// A recorder over a fixture tree, writing into a temporary store.
+struct Rig {
+  MachineTree tree;
+  TempDir store;
+  FakeClock clock;
+  recorder::MachineFiles machine{tree.dir.path()};
+  recorder::StatsLog log{store.path(),
+                         recorder::BootIdentity{*Uuid::parse("11111111-2222-3333-4444-555555555555"), "6.1.0"}, clock};
+  recorder::Recorder recorder{machine, clock, log, 1000};
+
+  Rig() { EXPECT_TRUE(log.start()); }
+  StoreContents contents() {
+    log.flush();
+    return StoreContents(store.path());
   }
 };
 

@@ -17,31 +17,10 @@
 #include "Records/SystemIO.h"
 #include "Records/SystemMemory.h"
 #include "recorder/CpuSource.h"
-#include "recorder/Recorder.h"
+#include "support/Records.h"
 
 namespace bw::test {
 namespace {
-
-using recorder::BootIdentity;
-
-// A recorder over a fixture tree, writing into a temporary store.
-struct Rig {
-  MachineTree tree;
-  TempDir store;
-  FakeClock clock;
-  recorder::MachineFiles machine{tree.dir.path()};
-  recorder::StatsLog log{store.path(), BootIdentity{*Uuid::parse("11111111-2222-3333-4444-555555555555"), "6.1.0"},
-                         clock};
-  recorder::Recorder recorder{machine, clock, log, 1000};
-
-  Rig() { EXPECT_TRUE(log.start()); }
-  StoreContents contents() {
-    log.flush();
-    return StoreContents(store.path());
-  }
-};
-
-std::uint64_t ticksPerSecond() { return static_cast<std::uint64_t>(sysconf(_SC_CLK_TCK)); }
 
 TEST(RecorderSources, BatteryDischargingThenOnExternalPower) {
   Rig rig;
@@ -71,24 +50,21 @@ TEST(RecorderSources, BatteryDischargingThenOnExternalPower) {
   rig.recorder.tick();
 
   const auto store = rig.contents();
-  const auto changes = store.all<PowerStateChange>();
-  ASSERT_EQ(changes.size(), 2u);
-  EXPECT_EQ(changes[0]->change(), 1u);  // battery
-  EXPECT_EQ(changes[1]->change(), 0u);  // external power
-  EXPECT_EQ(changes[1]->absoluteTime(), 5'120'000u);
-  EXPECT_EQ(changes[1]->wallTime(), 1'790'000'120'000u);
-  const auto levels = store.all<BatteryChargeLevel>();
-  ASSERT_EQ(levels.size(), 3u);
-  EXPECT_EQ(levels[0]->charge(), 3000);
-  EXPECT_EQ(levels[0]->maxCharge(), 5000);
-  EXPECT_EQ(levels[0]->cycleCount(), 42);
-  EXPECT_EQ(levels[0]->instantAmperage(), -1500);
-  EXPECT_EQ(levels[0]->instantVoltage(), 11400);
-  EXPECT_FALSE(levels[0]->isFullyCharged());
-  EXPECT_EQ(levels[2]->charge(), 5000);
-  EXPECT_EQ(levels[2]->instantAmperage(), 200);
-  EXPECT_TRUE(levels[2]->isFullyCharged());
-  EXPECT_EQ(levels[2]->absoluteTime(), 5'120'000u);
+  std::vector<std::string> records;
+  for (const Record* r : store.records) {
+    if (recordCast<PowerStateChange>(r) || recordCast<BatteryChargeLevel>(r)) records.push_back(fieldsOf(*r));
+  }
+  // Battery, then external power; the gauge at every tick.
+  EXPECT_EQ(records, (std::vector<std::string>{
+                         "{ absoluteTime = 5000000; change = 1; isFullyCharged = 0; wallTime = 1790000000000; }",
+                         "{ absoluteTime = 5000000; charge = 3000; cycleCount = 42; instantAmperage = -1500; "
+                         "instantVoltage = 11400; isFullyCharged = 0; maxCharge = 5000; }",
+                         "{ absoluteTime = 5060000; charge = 3000; cycleCount = 42; instantAmperage = -1500; "
+                         "instantVoltage = 11400; isFullyCharged = 0; maxCharge = 5000; }",
+                         "{ absoluteTime = 5120000; change = 0; isFullyCharged = 1; wallTime = 1790000120000; }",
+                         "{ absoluteTime = 5120000; charge = 5000; cycleCount = 42; instantAmperage = 200; "
+                         "instantVoltage = 11400; isFullyCharged = 1; maxCharge = 5000; }",
+                     }));
 }
 
 TEST(RecorderSources, EnergyOnlyBatteryInMilliampHours) {
@@ -137,36 +113,33 @@ TEST(RecorderSources, CpuidleAndRaplCountersMakePackageRecords) {
   writeCpus(tree, 1'000'000, 2'000'000, 1'000'000, 2'000'000, 900'000);
   recorder::MachineFiles machine(tree.dir.path());
   recorder::CpuSource cpu(machine);
+  ASSERT_EQ(sysconf(_SC_CLK_TCK), 100);  // /proc/stat counts in hundredths of a second
   const auto first = cpu.read(1000);
   ASSERT_TRUE(first.package);
-  EXPECT_EQ(first.package->energyModelMillijoules(), 900u);
-  EXPECT_EQ(first.package->pkgCanyResidency(), 0u);  // counting starts here
-  EXPECT_EQ(first.package->pkgFreq(), 2500u);
-  EXPECT_EQ(first.package->pkgFreqNominal(), 2400u);
-  EXPECT_EQ(first.package->qosBgTime(), 50 * 1000 / ticksPerSecond() / 2);
-  EXPECT_EQ(first.package->qosIdleTime(), 1000 * 1000 / ticksPerSecond() / 2);
-  ASSERT_EQ(first.cstates.size(), 3u);  // package, cpu0, cpu1
-  EXPECT_EQ(first.cstates[0].core(), -1);
-  EXPECT_FALSE(first.cstates[0].isCore());
-  EXPECT_TRUE(first.cstates[2].isCore());
-  EXPECT_EQ(first.cstates[2].core(), 1);
-  ASSERT_EQ(first.cstates[1].statesCount(), 3u);
-  EXPECT_EQ(first.cstates[1].statesAtIndex(2).residency(), 2000u);  // µs to ms
+  // Residency counting starts here; the mean frequency; QoS from /proc/stat
+  // (nice and idle time per CPU).
+  EXPECT_EQ(fieldsOf(*first.package),
+            "{ absolute_time = 1000; energy_model_millijoules = 900; pkg_cany_residency = 0; pkg_cmax_residency = 0; "
+            "pkg_freq = 2500; pkg_freq_nominal = 2400; qos_bg_time = 250; qos_idle_time = 5000; }");
+  ASSERT_EQ(first.cstates.size(), 3u);  // package, cpu0, cpu1; µs to ms
+  EXPECT_EQ(fieldsOf(first.cstates[0]),
+            "{ absolute_time = 1000; core = -1; is_core = 0; states = ( { level = 1; residency = 0; }, { level = 2; "
+            "residency = 0; } ); }");
+  EXPECT_EQ(fieldsOf(first.cstates[2]),
+            "{ absolute_time = 1000; core = 1; is_core = 1; states = ( { level = 0; residency = 0; }, { level = 1; "
+            "residency = 1000; }, { level = 2; residency = 2000; } ); }");
 
   // cpu0 idles 300 ms in C1 and 500 in C2, cpu1 200 and 700: the package
   // counts only what both did; the energy counter wrapped at 1 J.
   writeCpus(tree, 1'300'000, 2'500'000, 1'200'000, 2'700'000, 400'000);
   const auto second = cpu.read(2000);
   ASSERT_TRUE(second.package);
-  EXPECT_EQ(second.package->energyModelMillijoules(), 900u + 500u);
-  EXPECT_EQ(second.package->pkgCanyResidency(), 800u);
-  EXPECT_EQ(second.package->pkgCmaxResidency(), 500u);
-  const Cstates& pkg = second.cstates[0];
-  ASSERT_EQ(pkg.statesCount(), 2u);
-  EXPECT_EQ(pkg.statesAtIndex(0).level(), 1u);
-  EXPECT_EQ(pkg.statesAtIndex(0).residency(), 200u);
-  EXPECT_EQ(pkg.statesAtIndex(1).level(), 2u);
-  EXPECT_EQ(pkg.statesAtIndex(1).residency(), 500u);
+  EXPECT_EQ(fieldsOf(*second.package),
+            "{ absolute_time = 2000; energy_model_millijoules = 1400; pkg_cany_residency = 800; pkg_cmax_residency = "
+            "500; pkg_freq = 2500; pkg_freq_nominal = 2400; qos_bg_time = 250; qos_idle_time = 5000; }");
+  EXPECT_EQ(fieldsOf(second.cstates[0]),
+            "{ absolute_time = 2000; core = -1; is_core = 0; states = ( { level = 1; residency = 200; }, { level = 2; "
+            "residency = 500; } ); }");
 }
 
 TEST(RecorderSources, PackageMsrsWinOverTheCpuidleApproximation) {
@@ -226,23 +199,19 @@ TEST(RecorderSources, CountersOfWholeDisksNetworksInterruptsAndMemory) {
   rig.recorder.tick();
 
   const auto store = rig.contents();
+  // Whole disks only (sectors of 512 bytes); no loopback.
   const auto io = store.all<SystemIO>();
   ASSERT_EQ(io.size(), 1u);
-  EXPECT_EQ(io[0]->diskReadOps(), 110u);
-  EXPECT_EQ(io[0]->diskWriteOps(), 220u);
-  EXPECT_EQ(io[0]->diskBytesRead(), 2100u * 512);
-  EXPECT_EQ(io[0]->diskBytesWritten(), 4300u * 512);
-  EXPECT_EQ(io[0]->networkBytesIn(), 1300u);
-  EXPECT_EQ(io[0]->networkPacketsIn(), 13u);
-  EXPECT_EQ(io[0]->networkBytesOut(), 2400u);
-  EXPECT_EQ(io[0]->networkPacketsOut(), 24u);
-
-  const auto interrupts = store.all<Interrupts>();
+  EXPECT_EQ(fieldsOf(*io[0]),
+            "{ absoluteTime = 5000000; diskBytesRead = 1075200; diskBytesWritten = 2201600; diskReadOps = 110; "
+            "diskWriteOps = 220; networkBytesIn = 1300; networkBytesOut = 2400; networkPacketsIn = 13; "
+            "networkPacketsOut = 24; }");
+  const auto interrupts = store.all<Interrupts>();  // zero counts left out
   ASSERT_EQ(interrupts.size(), 1u);
-  ASSERT_EQ(interrupts[0]->vectorsCount(), 3u);  // zero counts left out
-  EXPECT_EQ(interrupts[0]->vectorsAtIndex(0).vectorName(), "0");
-  EXPECT_EQ(interrupts[0]->vectorsAtIndex(2).cpuNumber(), 1u);
-  EXPECT_EQ(interrupts[0]->vectorsAtIndex(2).interruptCount(), 700u);
+  EXPECT_EQ(fieldsOf(*interrupts[0]),
+            "{ absoluteTime = 5000000; vectors = ( { cpuNumber = 0; interruptCount = 12; vectorName = 0; }, { "
+            "cpuNumber = 0; interruptCount = 500; vectorName = LOC; }, { cpuNumber = 1; interruptCount = 700; "
+            "vectorName = LOC; } ); }");
 
   const auto memory = store.all<SystemMemory>();
   ASSERT_EQ(memory.size(), 1u);

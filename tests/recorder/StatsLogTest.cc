@@ -12,6 +12,7 @@
 #include "Records/UserIdle.h"
 #include "recorder/StatsLog.h"
 #include "store/StatsFileWriter.h"
+#include "support/Records.h"
 
 namespace bw::test {
 namespace {
@@ -20,13 +21,6 @@ using recorder::StatsLog;
 
 const Uuid kBoot = *Uuid::parse("AAAAAAAA-BBBB-CCCC-DDDD-000000000001");
 const Uuid kPrevious = *Uuid::parse("AAAAAAAA-BBBB-CCCC-DDDD-000000000000");
-
-UserIdle idleAt(std::uint64_t t) {
-  UserIdle u;
-  u.setAbsoluteTime(t);
-  u.setChange(1);
-  return u;
-}
 
 std::vector<std::string> statsFiles(const std::string& dir) {
   std::vector<std::string> names;
@@ -85,7 +79,7 @@ TEST(RecorderStatsLog, RotatesAndAnnouncesClockZoneAndDateChanges) {
   StatsLog log(store.path(), recorder::BootIdentity{kBoot, "6.1.0"}, clock, /*rotateMs=*/60'000);
   ASSERT_TRUE(log.start());
   for (int i = 0; i < 3; ++i) {
-    ASSERT_TRUE(log.write(idleAt(log.now())));
+    ASSERT_TRUE(log.write(idle(log.now())));
     clock.advance(30'000);
   }
   // 90 s in: the third record began a second file.
@@ -96,7 +90,7 @@ TEST(RecorderStatsLog, RotatesAndAnnouncesClockZoneAndDateChanges) {
   clock.wall += 3'600'000;  // the clock was set an hour ahead
   log.checkClock();
   log.checkClock();  // nothing new
-  ASSERT_TRUE(log.write(idleAt(log.now())));
+  ASSERT_TRUE(log.write(idle(log.now())));
   log.flush();
 
   EXPECT_EQ(statsFiles(store.path()).size(), 2u);
@@ -124,7 +118,7 @@ TEST(RecorderStatsLog, ASlowBatchBeginsOneFileNotOnePerRecord) {
   ASSERT_TRUE(log.start());
   const std::uint64_t stamp = log.now();
   clock.advance(70'000);  // the batch, stamped at its start, took longer than a file lasts
-  for (int i = 0; i < 5; ++i) ASSERT_TRUE(log.write(idleAt(stamp)));
+  for (int i = 0; i < 5; ++i) ASSERT_TRUE(log.write(idle(stamp)));
   log.flush();
   EXPECT_EQ(statsFiles(store.path()).size(), 2u);
   const StoreContents contents(store.path());
@@ -134,13 +128,8 @@ TEST(RecorderStatsLog, ASlowBatchBeginsOneFileNotOnePerRecord) {
 // The encoded bytes of a few records, as the recorder writes them.
 std::string encodedRecords(int count) {
   StatsFileWriter w;
-  LogStartsV1 h;
-  h.setVersion("1.4");
-  h.setAbsoluteTime(100);
-  h.setWallTime(1'790'000'000'000);
-  h.setBootUuid(std::string(kBoot.bytes().begin(), kBoot.bytes().end()));
-  w.append(h);
-  for (int i = 0; i < count; ++i) w.append(idleAt(200 + i));
+  w.append(logStart(kBoot, 100, 1'790'000'000'000));
+  for (int i = 0; i < count; ++i) w.append(idle(200 + i));
   return w.bytes();
 }
 
@@ -184,10 +173,10 @@ TEST(RecorderStatsLog, EveryRecordIsOneWholeWrite) {
   StatsLog log(store.path(), recorder::BootIdentity{kBoot, "6.1.0"}, clock);
   ASSERT_TRUE(log.start());
   const auto before = std::filesystem::file_size(log.currentPath());
-  ASSERT_TRUE(log.write(idleAt(log.now())));
+  ASSERT_TRUE(log.write(idle(log.now())));
   // Visible to a reader at once, before any flush: nothing is buffered.
   StatsFileWriter w;
-  w.append(idleAt(clock.absolute));
+  w.append(idle(clock.absolute));
   EXPECT_EQ(std::filesystem::file_size(log.currentPath()), before + w.bytes().size());
 }
 

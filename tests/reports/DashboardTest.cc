@@ -27,13 +27,6 @@ using test::Sample;
 
 constexpr std::uint64_t kMiB = 1048576, kGiB = 1073741824;
 
-PowerStateChange power(std::uint64_t abs, std::uint64_t wall, std::uint64_t change) {
-  PowerStateChange p;
-  p.setAbsoluteTime(abs);
-  p.setWallTime(wall);
-  p.setChange(change);
-  return p;
-}
 BatteryChargeLevel gauge(std::uint64_t abs, std::int64_t charge) { return test::gaugeAt(abs, charge, 12000); }
 
 // Two boots of version 20A1, one hour apart (positions are ms from boot A's
@@ -50,16 +43,10 @@ BatteryChargeLevel gauge(std::uint64_t abs, std::int64_t charge) { return test::
 void writeTwoBootStore(const test::TempDir& dir, bool laptop) {
   StatsFileWriter a;
   a.append(test::logStart(kBootA, 1000, kJan1 + 1000, "20A1", nullptr));
-  a.append(power(1000, kJan1 + 1000, laptop ? 1 : 0));
+  a.append(test::powerChange(laptop ? 1 : 0, 1000, kJan1 + 1000));
   if (laptop) a.append(gauge(1000, 4000));
   a.append(test::packageSample(1000, 500)), a.append(test::diskRead(1000, 0));
-  DeviceChange wifi;
-  wifi.setAbsoluteTime(1000);
-  wifi.setDeviceType(5);
-  wifi.setDeviceName("Built-in Wi-Fi");
-  wifi.setDeviceId("wlan0");
-  wifi.setNowConnected(1);
-  a.append(wifi);
+  a.append(test::device(DeviceChange::kWiFi, 1, 1000, "Built-in Wi-Fi", "wlan0"));
   Sample app{.uniqueid = 10, .at = 2000, .name = "App", .responsible = 10, .start = 500, .resident = 100 * kMiB};
   Sample helper{.uniqueid = 11, .at = 2000, .name = "helper", .parent = 10, .start = 1500, .resident = kMiB};
   a.append(test::processUsage(app)), a.append(test::processUsage(helper));
@@ -76,7 +63,7 @@ void writeTwoBootStore(const test::TempDir& dir, bool laptop) {
 
   StatsFileWriter b;
   b.append(test::logStart(kBootB, 1000, kJan1 + 7201000, "20A1", &kBootA, "20A1"));
-  b.append(power(1000, kJan1 + 7201000, 0));
+  b.append(test::powerChange(0, 1000, kJan1 + 7201000));
   if (laptop) b.append(gauge(1000, 3500));
   b.append(test::packageSample(1000, 500));
   Sample tool1{.uniqueid = 20, .at = 2000, .name = "Tool", .start = 1500, .resident = kGiB};

@@ -8,7 +8,6 @@
 #include "Records/DeviceChange.h"
 #include "Records/DisplayBrightness.h"
 #include "Records/PanelSelfRefresh.h"
-#include "base/Console.h"
 #include "cli/DailyRun.h"
 #include "cli/DailyStore.h"
 #include "cli/Options.h"
@@ -16,6 +15,7 @@
 #include "reports/JournalDailyReports.h"
 #include "reports/JournalSink.h"
 #include "reports/Telemetry.h"
+#include "support/ConsoleCapture.h"
 #include "support/FakePlatform.h"
 #include "support/MachineFixture.h"
 #include "support/TempDir.h"
@@ -35,20 +35,14 @@ class StoreWriter {
  public:
   explicit StoreWriter(bool battery) : battery_(battery) {
     w_.append(test::logStart(test::kBootA, 1000, kJan1, "B2", nullptr));
-    TimeChange zone;
-    zone.setAbsoluteTime(1500), zone.setWallTime(kJan1 + 500), zone.setZoneName("UTC"), zone.setGmtoff(0);
-    w_.append(zone);
+    w_.append(test::zoneChange("UTC", 0, 1500, kJan1 + 500));
   }
   template <class R>
   void add(std::uint64_t t, R r) {
     r.setAbsoluteTime(1000 + t);
     w_.append(r);
   }
-  void power(std::uint64_t t, std::uint64_t change) {
-    PowerStateChange p;
-    p.setChange(change), p.setWallTime(kJan1 + t);
-    add(t, p);
-  }
+  void power(std::uint64_t t, std::uint64_t change) { w_.append(test::powerChange(change, 1000 + t, kJan1 + t)); }
   void sleepWake(std::uint64_t t, std::uint32_t reason, bool standby = false) {
     SleepWake s = test::sleepWake(1000 + t, kJan1 + t, reason, standby ? "UserActivity" : "", standby);
     if (standby) s.setEfiMsec(100), s.setImageReadMsec(2000), s.setImagePages(100000);
@@ -56,12 +50,7 @@ class StoreWriter {
   }
   void write(const std::string& path) {
     power(1000, battery_ ? 1 : 0);
-    const auto device = [&](std::uint32_t type) {
-      DeviceChange d;
-      d.setDeviceType(type), d.setDeviceName("dev"), d.setNowConnected(1);
-      add(2000, d);
-    };
-    device(5), device(3);
+    add(2000, test::device(5, 1, 0, "dev")), add(2000, test::device(3, 1, 0, "dev"));
     DisplayBrightness b;
     b.setBrightness(50);
     add(2000, b);
@@ -69,12 +58,10 @@ class StoreWriter {
     psr.setPsrOn(0), psr.setPsrOff(0);
     add(2000, psr);
     if (battery_) add(2000, test::gaugeAt(0, 4000, 12000));
-    UserIdle idle;
-    idle.setChange(1);
-    add(kHour, idle);
+    add(kHour, test::idle());
     if (battery_) add(kHour, test::gaugeAt(0, 3800, 11800));
-    idle.setChange(0);
-    add(2 * kHour, idle);
+    const UserIdle active = test::idle(0, UserIdle::kActive);
+    add(2 * kHour, active);
     if (battery_) add(2 * kHour, test::gaugeAt(0, 3600, 11700));
     psr.setPsrOn(1800000), psr.setPsrOff(5400000);
     add(2 * kHour, psr);
@@ -83,7 +70,7 @@ class StoreWriter {
     sleepWake(5 * kHour, 2);
     sleepWake(5 * kHour + kHour / 2, 0);
     sleepWake(7 * kHour, 1, true);
-    for (std::uint64_t h = 8; h <= 25; ++h) add(h * kHour, idle);
+    for (std::uint64_t h = 8; h <= 25; ++h) add(h * kHour, active);
     w_.writeTo(path);
   }
 
@@ -222,16 +209,12 @@ TEST(TelemetryFields, KeysAndValuesAreCutAndNumbersRounded) {
 }
 
 TEST(TelemetryFields, DebugPrintsEveryFieldAndSendsNothing) {
-  std::ostringstream o, e;
-  setConsole(&o, &e);
-  gDebug = 1;
+  test::ConsoleCapture console;
   CapturingSink sink;
   TelemetryMessage m("d");
   m.setField("ac", "x", "1");
   finishMessage(m, sink);
-  gDebug = 0;
-  setConsole(nullptr, nullptr);
-  EXPECT_EQ(e.str(), "com.vexil.message.ac.x: 1\n");
+  EXPECT_EQ(console.err.str(), "com.vexil.message.ac.x: 1\n");
   EXPECT_TRUE(sink.messages.empty());
 }
 

@@ -22,9 +22,9 @@
 #include "Records/TimeChange.h"
 #include "Records/UserIdle.h"
 #include "SampleStore.h"
-#include "base/Console.h"
 #include "store/RecordReader.h"
 #include "store/StatsFileList.h"
+#include "support/ConsoleCapture.h"
 #include "support/TempDir.h"
 #include "time/AbsoluteTimeline.h"
 #include "time/BootSequencer.h"
@@ -107,11 +107,9 @@ TEST(SampleStoreContents, BootsChainByTheirHeadersAndTheUpdateStartsANewVersion)
   EXPECT_EQ(updates, 1);
   // Sequencing keeps every boot: one chain per version, no warning.
   BootRecords copy = store.read.boots;
-  std::ostringstream out, err;
-  setConsole(&out, &err);
+  test::ConsoleCapture console(0);
   const auto timelines = sequenceBoots(copy);
-  setConsole(nullptr, nullptr);
-  EXPECT_EQ(out.str(), "");
+  EXPECT_EQ(console.out.str(), "");
   ASSERT_EQ(timelines.size(), 2u);
   std::size_t chained = 0;
   for (const auto& [version, timeline] : timelines) chained += timeline->objects().size();

@@ -10,10 +10,10 @@
 #include "base/Platform.h"
 #include "cli/Run.h"
 #include "service/AnalysisService.h"
-#include "service/PrivateBus.h"
 #include "service/SamplerPair.h"
 #include "service/ServiceStores.h"
 #include "support/FakePlatform.h"
+#include "support/PrivateBus.h"
 #include "support/RunTool.h"
 
 namespace bw {
@@ -27,12 +27,7 @@ const Uuid kBoot = *Uuid::parse("5E5E5E5E-0000-0000-0000-00000000000A");
 constexpr std::uint64_t kWallStart = 1700000000000;
 constexpr std::uint64_t kDataEnd = kWallStart + 94000;  // the battery store's last record
 
-template <class T>
-const T& get(const MessageDictionary& d, const std::string& key) {
-  const T* v = d.at(key).getIf<T>();
-  if (!v) throw std::runtime_error(key + " came as " + signatureOf(d.at(key)));
-  return *v;
-}
+using test::get;
 
 // The service as `brindlewick --debug --xpc --from STORE`, run in a child of
 // the test with a fixed clock and boot.
@@ -98,9 +93,6 @@ TEST_F(BusService, AnswersEachRequestTypeWithTheWireTypes) {
   EXPECT_EQ(get<std::vector<std::string>>(get<MessageDictionary>(examined.reply, "launchd_jobs"), "labels"),
             std::vector<std::string>{"alpha"});
 
-  EXPECT_EQ(call({}).reply, (MessageDictionary{{"error", "Expected string request_type in request"}}));
-  EXPECT_EQ(call({{"request_type", std::int64_t{7}}}).reply,
-            (MessageDictionary{{"error", "Expected string request_type in request"}}));
   EXPECT_EQ(call({{"request_type", "top_jobs"}}).reply,
             (MessageDictionary{{"error", "Unrecognized request_type in request"}}));
 
@@ -118,17 +110,9 @@ TEST_F(BusService, AnswersEachRequestTypeWithTheWireTypes) {
 }
 
 TEST_F(BusService, ADataEndFiveSecondsAheadEndsTheService) {
-  {
-    auto service = serve(kDataEnd - 4999);
-    ASSERT_TRUE(service->running()) << service->err();
-    CallResult graph = call({{"request_type", "battery_charge_graph"}});
-    EXPECT_EQ(graph.error, "");
-    EXPECT_EQ(get<std::uint64_t>(graph.reply, "time_since_full_charge"), 0u);
-  }
   auto service = serve(kDataEnd - 5000);
   ASSERT_TRUE(service->running()) << service->err();
-  CallResult graph = call({{"request_type", "battery_charge_graph"}});
-  EXPECT_NE(graph.error, "");
+  ASSERT_NE(call({{"request_type", "battery_charge_graph"}}).error, "");  // else it would not end: no wait
   EXPECT_EQ(service->wait(), 70);
   EXPECT_NE(service->err().find("brindlewick: *** uncaught exception NSInternalInconsistencyException: wall time was "
                                 "less than last wall time in data\n"),
@@ -261,10 +245,11 @@ TEST_F(BusService, TheToolServesTheNameOnceAndIntrospects) {
   test::TempDir live;
   test::writeBatteryStore(live / "battery.stats", *platform().currentBootUuid(), version, start);
   const std::string dir = live.path();
-  ServiceProcess service(*bus, [dir] {
+  const auto tool = [dir] {
     execl(BRINDLEWICK_BINARY, "brindlewick", "--debug", "--xpc", "--from", dir.c_str(), static_cast<char*>(nullptr));
     return 127;
-  });
+  };
+  ServiceProcess service(*bus, tool);
   ASSERT_TRUE(service.running()) << service.err();
 
   test::RunSettings env;
@@ -282,14 +267,7 @@ TEST_F(BusService, TheToolServesTheNameOnceAndIntrospects) {
   EXPECT_NE(called.out.find("\"charge_levels\" ad 5 80 78 78 76 74 \"charge_times\" at 5 "), std::string::npos)
       << called.out << called.err;
 
-  ServiceProcess second(
-      *bus,
-      [dir] {
-        execl(BRINDLEWICK_BINARY, "brindlewick", "--debug", "--xpc", "--from", dir.c_str(),
-              static_cast<char*>(nullptr));
-        return 127;
-      },
-      false);
+  ServiceProcess second(*bus, tool, false);
   EXPECT_EQ(second.wait(), 1);
 
   test::ToolResult debug = test::runTool({"--xpc-debug", "--from", dir});

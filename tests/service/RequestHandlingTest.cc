@@ -1,11 +1,11 @@
 #include <gtest/gtest.h>
 
 #include "base/Console.h"
-#include "base/Exception.h"
 #include "service/Message.h"
 #include "service/RequestDispatch.h"
 #include "service/ServiceStores.h"
 #include "support/FakePlatform.h"
+#include "support/Thrown.h"
 
 namespace bw {
 namespace {
@@ -14,12 +14,7 @@ const Uuid kCurrentBoot = *Uuid::parse("5E5E5E5E-0000-0000-0000-00000000000A");
 const Uuid kOtherBoot = *Uuid::parse("5E5E5E5E-0000-0000-0000-00000000000B");
 constexpr std::uint64_t kWallStart = 1700000000000;
 
-template <class T>
-const T& get(const MessageDictionary& d, const std::string& key) {
-  const T* v = d.at(key).getIf<T>();
-  if (!v) throw std::runtime_error(key + " has the type " + signatureOf(d.at(key)));
-  return *v;
-}
+using test::get;
 
 class RequestHandling : public ::testing::Test {
  protected:
@@ -95,13 +90,11 @@ TEST_F(RequestHandling, BatteryGraphTakesADataEndUnderFiveSecondsAheadAsNow) {
   EXPECT_EQ(get<std::vector<std::uint64_t>>(reply, "charge_times").front(), 93u);
 
   setNow(end - 5000);
-  try {
-    request({{"request_type", "battery_charge_graph"}});
-    FAIL() << "no exception";
-  } catch (const Exception& e) {
-    EXPECT_EQ(e.name(), kInternalInconsistencyException);
-    EXPECT_EQ(e.reason(), "wall time was less than last wall time in data");
-  }
+  test::thrown(
+      [&] {
+        request({{"request_type", "battery_charge_graph"}});
+      },
+      kInternalInconsistencyException, "wall time was less than last wall time in data");
 }
 
 TEST_F(RequestHandling, BatteryGraphNeedsExactlyOneModelOfTheRunningBuild) {
@@ -110,12 +103,11 @@ TEST_F(RequestHandling, BatteryGraphNeedsExactlyOneModelOfTheRunningBuild) {
   setNow(kWallStart + 200000);
   for (std::optional<std::string> running : {std::optional<std::string>("7.0.0-none"), std::optional<std::string>()}) {
     fake.systemVersion = running;  // no such build; unknown: both builds
-    try {
-      request({{"request_type", "battery_charge_graph"}});
-      FAIL() << "no exception";
-    } catch (const Exception& e) {
-      EXPECT_EQ(e.reason(), "multiple system versions detected");
-    }
+    test::thrown(
+        [&] {
+          request({{"request_type", "battery_charge_graph"}});
+        },
+        kInternalInconsistencyException, "multiple system versions detected");
   }
 }
 

@@ -14,13 +14,23 @@
 // Job store (last record at position 49000): jobs from the table below,
 // each one process starting at absolute time 1500, sampled at 2000 with no
 // CPU time and at 50000 with its total (or at 40000 with its exit).
+#include <stdexcept>
 #include <string>
 #include <vector>
 
 #include "cli/RecordModesStore.h"
+#include "service/Message.h"
 #include "summarizers/ProcessRecords.h"
 
 namespace bw::test {
+
+// The reply's entry `key` as a T; throws naming the type it came as.
+template <class T>
+const T& get(const MessageDictionary& d, const std::string& key) {
+  const T* v = d.at(key).getIf<T>();
+  if (!v) throw std::runtime_error(key + " came as " + signatureOf(d.at(key)));
+  return *v;
+}
 
 struct ServiceJob {
   const char* name;
@@ -43,24 +53,16 @@ inline void writeBatteryStore(const std::string& path, const Uuid& bootUuid, con
                               std::uint64_t wallStart) {
   const std::uint64_t skew = wallStart - 1000;
   auto batteryAt = [](std::uint64_t abs, std::int64_t charge) { return gaugeAt(abs, charge, 12000); };
-  auto power = [skew](std::uint64_t abs, std::uint64_t change, bool full) {
-    PowerStateChange c;
-    c.setAbsoluteTime(abs);
-    c.setWallTime(skew + abs);
-    c.setChange(change);
-    if (full) c.setIsFullyCharged(true);
-    return c;
-  };
   StatsFileWriter w;
   w.append(logStart(bootUuid, 1000, wallStart, version, nullptr));
   w.append(batteryAt(2000, 4000));
-  w.append(power(3000, 1, false));
+  w.append(powerChange(1, 3000, skew + 3000));
   w.append(batteryAt(62000, 3900));
   w.append(sleepWake(std::uint64_t{70000}, skew + 70000, 0u));
   w.append(sleepWake(std::uint64_t{71000}, skew + 71000, 1u));
   w.append(batteryAt(81000, 3800));
   w.append(batteryAt(91000, 3700));
-  w.append(power(95000, 0, true));
+  w.append(powerChange(0, 95000, skew + 95000, true));
   w.writeTo(path);
 }
 

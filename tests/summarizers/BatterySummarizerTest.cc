@@ -4,11 +4,10 @@
 
 #include <cmath>
 #include <limits>
-#include <sstream>
 
 #include "Events.h"
-#include "base/Console.h"
 #include "model/Model.h"
+#include "support/ConsoleCapture.h"
 
 namespace bw {
 namespace {
@@ -33,13 +32,9 @@ TEST(BatterySummary, DischargeGivesPowerWeightedBySecondsAndItsExtremes) {
   BatterySummarizer s;
   feed(s, level(5000, 6000, 12000), 0);
   feed(s, level(4000, 6100, 11000), kHour);
-  std::ostringstream out, err;
-  setConsole(&out, &err);
-  gDebug = 1;
+  test::ConsoleCapture console;
   const PowerSummary p = summarize(s, {0, kHour});
-  gDebug = 0;
-  setConsole(nullptr, nullptr);
-  EXPECT_EQ(err.str(), "Power [0.3600000]: Ah = -1, V = 11.5, h = 1 : mW = -11500\n");
+  EXPECT_EQ(console.err.str(), "Power [0.3600000]: Ah = -1, V = 11.5, h = 1 : mW = -11500\n");
   EXPECT_EQ(p.deltaCharge(), -1000);
   EXPECT_EQ(p.maxCharge(), 6100);  // the larger end
   EXPECT_DOUBLE_EQ(average(p), -11500);

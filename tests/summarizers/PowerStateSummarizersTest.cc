@@ -31,63 +31,63 @@ class States {
 // A device type nobody follows: it only marks a record's position.
 const DeviceChange kNeutral = test::device(1, 1);
 
-TEST(PowerStates, SleepThenDarkWakeThenWakeSplitTheTimeline) {
-  States states;
-  states.add(kNeutral, 0);
-  states.add(test::sleepWake(0, 0, 0), 100);
-  states.add(test::sleepWake(0, 0, 2), 150);
-  states.add(test::sleepWake(0, 0, 1), 200);
-  EXPECT_EQ(states["Sleep"], (Ranges{{100, 50}}));
-  EXPECT_EQ(states["DarkWake"], (Ranges{{150, 50}}));
-  EXPECT_EQ(states["Wake"], (Ranges{{0, 100}}));  // open again from 200
-  states.finish(300);
-  EXPECT_EQ(states["Wake"], (Ranges{{0, 100}, {200, 100}}));
-}
+struct Fed {
+  const Record& record;
+  std::uint64_t position;
+  std::uint8_t boot = 1;
+};
 
-TEST(PowerStates, OnlyWakeAndActiveStartAtBootAndEveryStateEndsAtShutdown) {
-  States states;
-  states.add(kNeutral, 10);
-  states.add(test::sleepWake(0, 0, 0), 20);
-  states.add(kNeutral, 30);
-  states.add(kNeutral, 40, 2);
-  states.add(kNeutral, 60, 2);
-  states.finish(60);
-  EXPECT_EQ(states["Wake"], (Ranges{{10, 10}, {40, 20}}));
-  EXPECT_EQ(states["Active"], (Ranges{{10, 20}, {40, 20}}));
-  EXPECT_EQ(states["Sleep"], (Ranges{{20, 10}}));  // closed at boot 1's last record
-  for (const char* key : {"A/C", "Battery", "Idle", "DarkWake", "Wi-Fi", "Bluetooth", "DiscreteGraphics"})
-    EXPECT_TRUE(states[key].empty()) << key;
-}
-
-TEST(PowerStates, PowerSourceAndUserIdleFollowTheirCodes) {
-  States states;
-  states.add(test::powerChange(0), 0);
-  states.add(test::idle(0, 1), 30);
-  states.add(test::powerChange(1), 50);
-  states.add(test::idle(0, 0), 70);
-  states.add(test::powerChange(std::uint64_t{1} << 32), 80);  // compared as 32 bits: external power
-  states.finish(100);
-  EXPECT_EQ(states["A/C"], (Ranges{{0, 50}, {80, 20}}));
-  EXPECT_EQ(states["Battery"], (Ranges{{50, 30}}));
-  EXPECT_EQ(states["Active"], (Ranges{{0, 30}, {70, 30}}));
-  EXPECT_EQ(states["Idle"], (Ranges{{30, 40}}));
-}
-
-TEST(PowerStates, DevicesFollowTheirOwnTypeOnly) {
-  States states;
-  for (auto [type, connected, position] : {std::tuple{5u, 1u, 10u},
-                                           {6u, 1u, 20u},
-                                           {5u, 0u, 30u},
-                                           {5u, 0u, 40u},  // Wi-Fi already off: nothing changes
-                                           {9u, 2u, 50u},  // any non-zero state turns it on
-                                           {6u, 0u, 60u},
-                                           {9u, 0u, 70u}}) {
-    states.add(test::device(type, connected), position);
+TEST(PowerStates, EachStateFollowsItsRecordsBootsAndShutdowns) {
+  const SleepWake sleep = test::sleepWake(0, 0, 0), dark = test::sleepWake(0, 0, 2), wake = test::sleepWake(0, 0, 1);
+  const PowerStateChange ac = test::powerChange(0), battery = test::powerChange(1);
+  const PowerStateChange high = test::powerChange(std::uint64_t{1} << 32);  // compared as 32 bits: external power
+  const UserIdle idle = test::idle(0, 1), active = test::idle(0, 0);
+  const DeviceChange wifiOn = test::device(5, 1), wifiOff = test::device(5, 0), btOn = test::device(6, 1);
+  const DeviceChange btOff = test::device(6, 0), gpuOn = test::device(9, 2), gpuOff = test::device(9, 0);
+  const struct {
+    const char* what;
+    std::vector<Fed> records;
+    std::uint64_t last;
+    std::map<std::string, Ranges> expected;  // states not named held never
+  } cases[] = {
+      // Wake is open again from 200 until the last position.
+      {"sleep, dark wake, wake",
+       {{kNeutral, 0}, {sleep, 100}, {dark, 150}, {wake, 200}},
+       300,
+       {{"Sleep", {{100, 50}}}, {"DarkWake", {{150, 50}}}, {"Wake", {{0, 100}, {200, 100}}}, {"Active", {{0, 300}}}}},
+      // Sleep is closed at boot 1's last record.
+      {"only wake and active start at boot; all end at shutdown",
+       {{kNeutral, 10}, {sleep, 20}, {kNeutral, 30}, {kNeutral, 40, 2}, {kNeutral, 60, 2}},
+       60,
+       {{"Wake", {{10, 10}, {40, 20}}}, {"Active", {{10, 20}, {40, 20}}}, {"Sleep", {{20, 10}}}}},
+      {"power source and user idle",
+       {{ac, 0}, {idle, 30}, {battery, 50}, {active, 70}, {high, 80}},
+       100,
+       {{"A/C", {{0, 50}, {80, 20}}},
+        {"Battery", {{50, 30}}},
+        {"Active", {{0, 30}, {70, 30}}},
+        {"Idle", {{30, 40}}},
+        {"Wake", {{0, 100}}}}},
+      // Wi-Fi already off changes nothing; any non-zero state turns a device on.
+      {"devices follow their own type",
+       {{wifiOn, 10}, {btOn, 20}, {wifiOff, 30}, {wifiOff, 40}, {gpuOn, 50}, {btOff, 60}, {gpuOff, 70}},
+       100,
+       {{"Wi-Fi", {{10, 20}}},
+        {"Bluetooth", {{20, 40}}},
+        {"DiscreteGraphics", {{50, 20}}},
+        {"Wake", {{10, 90}}},
+        {"Active", {{10, 90}}}}},
+  };
+  for (const auto& c : cases) {
+    States states;
+    for (const Fed& f : c.records) states.add(f.record, f.position, f.boot);
+    states.finish(c.last);
+    for (const char* key :
+         {"Wake", "Active", "Sleep", "DarkWake", "A/C", "Battery", "Idle", "Wi-Fi", "Bluetooth", "DiscreteGraphics"}) {
+      const auto expected = c.expected.find(key);
+      EXPECT_EQ(states[key], expected == c.expected.end() ? Ranges{} : expected->second) << c.what << ": " << key;
+    }
   }
-  states.finish(100);
-  EXPECT_EQ(states["Wi-Fi"], (Ranges{{10, 20}}));
-  EXPECT_EQ(states["Bluetooth"], (Ranges{{20, 40}}));
-  EXPECT_EQ(states["DiscreteGraphics"], (Ranges{{50, 20}}));
 }
 
 }  // namespace

@@ -6,7 +6,7 @@
 #include <sstream>
 
 #include "ProcessRecords.h"
-#include "base/Console.h"
+#include "support/ConsoleCapture.h"
 #include "support/FakePlatform.h"
 
 namespace bw {
@@ -21,18 +21,10 @@ constexpr double kMs = 1e6;  // nanoseconds
 // Debug lines and the system log captured; the once-per-run messages armed.
 class ProcessAccounting : public ::testing::Test {
  protected:
-  ProcessAccounting() {
-    setConsole(&out_, &err_);
-    gDebug = 1;
-    ProcessSummarizer::resetLoggedMessages();
-  }
-  ~ProcessAccounting() override {
-    gDebug = 0;
-    setConsole(nullptr, nullptr);
-  }
+  ProcessAccounting() { ProcessSummarizer::resetLoggedMessages(); }
   std::vector<std::string> debugLines() const {
     std::vector<std::string> lines;
-    std::istringstream in(err_.str());
+    std::istringstream in(console_.err.str());
     for (std::string line; std::getline(in, line);) lines.push_back(line);
     return lines;
   }
@@ -50,7 +42,7 @@ class ProcessAccounting : public ::testing::Test {
     return keys;
   }
 
-  std::ostringstream out_, err_;
+  test::ConsoleCapture console_;
   test::FakePlatform platform_;
 };
 
@@ -199,45 +191,17 @@ TEST_F(Ownership, AParentIdCycleEndsWithOneOfItsProcessesOwningBoth) {
 class JobSummaries : public ProcessAccounting {
  protected:
   JobSummaries() {
-    feed(s, {.uniqueid = 10,
-             .at = 500,
-             .name = "App",
-             .parent = 1,
-             .responsible = 10,
-             .cpuMs = 50,
-             .idle = 4,
-             .start = 100,
-             .resident = 8192});
-    feed(s, {.uniqueid = 10,
-             .at = 1000,
-             .status = 0,
-             .name = "App",
-             .parent = 1,
-             .responsible = 10,
-             .cpuMs = 100,
-             .idle = 10,
-             .interrupts = 20,
-             .start = 100,
-             .resident = 4096});
-    feed(s, {.uniqueid = 11,
-             .at = 1000,
-             .status = 0,
-             .name = "Helper",
-             .parent = 1,
-             .responsible = 10,
-             .cpuMs = 40,
-             .idle = 6,
-             .interrupts = 8,
-             .start = 200});
-    feed(s, {.uniqueid = 12,
-             .at = 1500,
-             .name = "Daemon",
-             .parent = 1,
-             .responsible = 12,
-             .cpuMs = 10,
-             .idle = 1,
-             .interrupts = 3,
-             .start = 50});
+    Sample app{.uniqueid = 10, .at = 500, .name = "App", .responsible = 10, .cpuMs = 50, .idle = 4, .start = 100};
+    app.resident = 8192;
+    feed(s, app);
+    app.at = 1000, app.status = 0, app.cpuMs = 100, app.idle = 10, app.interrupts = 20, app.resident = 4096;
+    feed(s, app);
+    Sample helper{.uniqueid = 11, .at = 1000, .status = 0, .name = "Helper", .responsible = 10, .cpuMs = 40};
+    helper.idle = 6, helper.interrupts = 8, helper.start = 200;
+    feed(s, helper);
+    Sample daemon{.uniqueid = 12, .at = 1500, .name = "Daemon", .responsible = 12, .cpuMs = 10, .idle = 1};
+    daemon.interrupts = 3, daemon.start = 50;
+    feed(s, daemon);
     s.setLastPosition(1500);
   }
   std::unique_ptr<ProcessSummary> summarize(bool includingSubjobs, std::vector<AbsRange> ranges = {whole()}) {

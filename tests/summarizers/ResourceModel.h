@@ -5,8 +5,8 @@
 #include <memory>
 #include <vector>
 
-#include "Records/LogStartsV1.h"
 #include "model/Model.h"
+#include "support/Records.h"
 #include "time/BootTimeline.h"
 
 namespace bw::test {
@@ -15,18 +15,12 @@ class ResourceModel {
  public:
   // Takes ownership of the records; their absolute times must ascend.
   explicit ResourceModel(std::vector<std::unique_ptr<Record>> records) : records_(std::move(records)) {
-    auto header = std::make_unique<LogStartsV1>();
-    header->setVersion("1");
-    header->setAbsoluteTime(0);
-    header->setWallTime(1700000000000);
-    header->setBootUuid(std::string(16, '\x07'));
-    header->setSystemVersion("22A100");
-    records_.insert(records_.begin(), std::move(header));
+    records_.insert(records_.begin(),
+                    std::make_unique<LogStartsV1>(logStart(bootNamed(7), 0, 1700000000000, "22A100")));
     std::vector<Record*> pointers;
     for (auto& r : records_) pointers.push_back(r.get());
     std::vector<std::unique_ptr<Timeline>> boots;
-    boots.push_back(
-        std::make_unique<BootTimeline>(Uuid(Uuid::Bytes{7, 7, 7, 7, 7, 7, 7, 7, 7, 7, 7, 7, 7, 7, 7, 7}), pointers));
+    boots.push_back(std::make_unique<BootTimeline>(bootNamed(7), pointers));
     model_ = std::make_unique<Model>(Timeline::timelineWithTimelines(std::move(boots)), "22A100");
     model_->processEventsWithDomains({}, true);
   }

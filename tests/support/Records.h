@@ -15,6 +15,7 @@
 #include "Records/TimeChange.h"
 #include "Records/UserIdle.h"
 #include "base/Uuid.h"
+#include "base/Value.h"
 
 namespace bw::test {
 
@@ -75,11 +76,15 @@ inline PowerStateChange powerChange(std::uint64_t change, std::uint64_t abs = 0,
   return p;
 }
 
-inline DeviceChange device(std::uint32_t type, std::uint32_t connected, std::uint64_t abs = 0) {
+// An empty name or id stays absent.
+inline DeviceChange device(std::uint32_t type, std::uint32_t connected, std::uint64_t abs = 0,
+                           const std::string& name = "", const std::string& id = "") {
   DeviceChange d;
   d.setAbsoluteTime(abs);
   d.setDeviceType(type);
   d.setNowConnected(connected);
+  if (!name.empty()) d.setDeviceName(name);
+  if (!id.empty()) d.setDeviceId(id);
   return d;
 }
 
@@ -127,6 +132,17 @@ inline TimeChange zoneChange(const std::string& zoneName, std::int64_t gmtoff, s
   t.setZoneName(zoneName);
   t.setGmtoff(gmtoff);
   return t;
+}
+
+// The record as the dump prints it, on one line: "{ absoluteTime = 5; charge
+// = 3; }" with every field that is set, in name order.
+inline std::string fieldsOf(const Record& r) {
+  std::string text;
+  for (char c : describeValue(Value(r.dictionaryRepresentation()))) {
+    if (c == '\n') c = ' ';
+    if (c != ' ' || text.empty() || text.back() != ' ') text += c;
+  }
+  return text;
 }
 
 }  // namespace bw::test

@@ -14,8 +14,8 @@
 #include "base/Platform.h"
 #include "service/AnalysisService.h"
 #include "service/BusCodec.h"
-#include "service/PrivateBus.h"
 #include "service/ServiceStores.h"
+#include "support/PrivateBus.h"
 
 using namespace bw;
 

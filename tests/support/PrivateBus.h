@@ -1,7 +1,8 @@
 #pragma once
-// A private dbus-daemon for the service's tests, with its own configuration:
-// the system bus's default-deny rules, the analysis service's policy file
-// from dist/, and root allowed to own the sampler's name. Plus a client
+// A private dbus-daemon for the bus tests. By default it has the system
+// bus's default-deny rules, the analysis service's policy file from dist/,
+// and root allowed to own the sampler's name; an open bus lets anyone own any
+// name and send anything (for stand-ins of system services). Plus a client
 // call of Request and a service process started against it.
 #include <sys/types.h>
 #include <systemd/sd-bus.h>
@@ -19,7 +20,7 @@ class PrivateBus {
   // Whether a dbus-daemon is installed (the tests skip without one).
   static bool available();
 
-  PrivateBus();
+  explicit PrivateBus(bool open = false);
   ~PrivateBus();
   PrivateBus(const PrivateBus&) = delete;
   PrivateBus& operator=(const PrivateBus&) = delete;

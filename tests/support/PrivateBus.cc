@@ -1,4 +1,4 @@
-#include "service/PrivateBus.h"
+#include "support/PrivateBus.h"
 
 #include <fcntl.h>
 #include <sys/stat.h>
@@ -18,15 +18,11 @@ namespace bw::test {
 
 bool PrivateBus::available() { return access("/usr/bin/dbus-daemon", X_OK) == 0; }
 
-PrivateBus::PrivateBus() {
+PrivateBus::PrivateBus(bool open) {
   chmod(dir_.path().c_str(), 0755);  // reachable for the clients that drop root
   const std::string socket = dir_ / "bus";
-  dir_.write("bus.conf", R"(<!DOCTYPE busconfig PUBLIC "-//freedesktop//DTD D-Bus Bus Configuration 1.0//EN"
- "http://www.freedesktop.org/standards/dbus/1.0/busconfig.dtd">
-<busconfig>
-  <listen>unix:path=)" + socket +
-                             R"(</listen>
-  <auth>EXTERNAL</auth>
+  // The later default policy of an open bus overrides the denials before it.
+  const std::string policy = R"(
   <policy context="default">
     <allow user="*"/>
     <deny own="*"/>
@@ -45,9 +41,18 @@ PrivateBus::PrivateBus() {
     <allow own="com.vexil.brindlewick.sampler"/>
   </policy>
   <include>)" + std::string(BRINDLEWICK_SOURCE_DIR) +
-                             R"(/dist/com.vexil.brindlewick.analysis.conf</include>
-</busconfig>
-)");
+                             "/dist/com.vexil.brindlewick.analysis.conf</include>" +
+                             (open ? R"(
+  <policy context="default">
+    <allow own="*"/>
+    <allow send_type="method_call"/>
+  </policy>)"
+                                   : "");
+  dir_.write("bus.conf", R"(<!DOCTYPE busconfig PUBLIC "-//freedesktop//DTD D-Bus Bus Configuration 1.0//EN"
+ "http://www.freedesktop.org/standards/dbus/1.0/busconfig.dtd">
+<busconfig>
+  <listen>unix:path=)" + socket +
+                             "</listen>\n  <auth>EXTERNAL</auth>" + policy + "\n</busconfig>\n");
   int fds[2];
   if (pipe(fds) != 0) throw std::runtime_error("pipe failed");
   daemon_ = fork();
