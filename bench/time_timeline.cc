@@ -40,7 +40,7 @@ struct Run {
       bw::Uuid::Bytes bytes{};
       bytes[0] = std::uint8_t(b + 1);
       const bw::Uuid uuid(bytes);
-      std::vector<bw::RecordRef>& records = boots[uuid];
+      bw::RecordList& records = boots[uuid];
       auto& header = headers.emplace_back();
       header.setVersion("1");
       header.setAbsoluteTime(0);

@@ -7,8 +7,10 @@
 // is read from the record itself (see wallTimeOf).
 #include <cstdint>
 #include <span>
+#include <vector>
 
 #include "Records/Record.h"
+#include "base/HugePageAllocator.h"
 
 namespace bw {
 
@@ -74,5 +76,9 @@ class RecordRef {
 };
 
 static_assert(sizeof(RecordRef) == 16);
+
+// A list of handles: a boot's records run to millions, so large lists sit on
+// huge pages.
+using RecordList = std::vector<RecordRef, HugePageAllocator<RecordRef>>;
 
 }  // namespace bw

@@ -232,19 +232,19 @@ class BootGrouper {
   RecordsByBoot finish() {
     // Each boot's files joined once, at their full size.
     for (auto& [boot, files] : files_) {
-      std::vector<RecordRef>& records = out_.boots[boot];
+      RecordList& records = out_.boots[boot];
       records = std::move(files.front());
       std::size_t total = 0;
-      for (const std::vector<RecordRef>& f : files) total += f.size();
+      for (const RecordList& f : files) total += f.size();
       records.reserve(total);
       for (std::size_t i = 1; i < files.size(); ++i) {
         records.insert(records.end(), files[i].begin(), files[i].end());
-        std::vector<RecordRef>().swap(files[i]);
+        RecordList().swap(files[i]);
       }
     }
     files_.clear();
     for (const Uuid& boot : damaged_) {
-      std::vector<RecordRef>& records = out_.boots[boot];
+      RecordList& records = out_.boots[boot];
       std::erase_if(records, [](const RecordRef& r) { return r.recordClass() != RecordClass::LogStartsV1; });
     }
     return std::move(out_);
@@ -252,7 +252,7 @@ class BootGrouper {
 
  private:
   RecordsByBoot out_;
-  std::unordered_map<Uuid, std::vector<std::vector<RecordRef>>> files_;  // per boot, in reading order
+  std::unordered_map<Uuid, std::vector<RecordList>> files_;  // per boot, in reading order
   std::vector<Uuid> damaged_;
   std::unordered_set<Uuid> writerFiveSeen_;
 };

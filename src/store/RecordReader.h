@@ -32,7 +32,7 @@ namespace bw {
 // Record handles per boot: the records of all files of that boot, file after
 // file, each file's records in file order. A header without a boot UUID files
 // its records under the all-zero UUID.
-using BootRecords = std::unordered_map<Uuid, std::vector<RecordRef>>;
+using BootRecords = std::unordered_map<Uuid, RecordList>;
 
 // What record handles point into: mapped files and records kept decoded.
 struct RecordStorage {
@@ -56,12 +56,12 @@ struct ReadNote {
 
 // What one file contributed.
 struct FileRecords {
-  std::vector<RecordRef> records;  // empty when the file was dropped
-  RecordStorage storage;           // what `records` point into (not the caller's bytes)
-  std::vector<ReadNote> notes;     // in the order they arose
-  bool damaged = false;            // decoding failed after the header was read
-  bool undecodable = false;        // decoding failed before any record was kept
-  int openError = 0;               // errno when the file could not be opened
+  RecordList records;           // empty when the file was dropped
+  RecordStorage storage;        // what `records` point into (not the caller's bytes)
+  std::vector<ReadNote> notes;  // in the order they arose
+  bool damaged = false;         // decoding failed after the header was read
+  bool undecodable = false;     // decoding failed before any record was kept
+  int openError = 0;            // errno when the file could not be opened
 };
 
 // Writes a file's notes where they belong.

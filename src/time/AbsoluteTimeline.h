@@ -78,7 +78,7 @@ class AbsoluteTimeline : public Timeline {
 
   const BootTimeline* boot_;
   Uuid bootUuid_;
-  std::vector<RecordRef> owned_;      // records added by copy
+  RecordList owned_;                  // records added by copy
   const RecordRef* first_ = nullptr;  // or records left in place
   std::size_t count_ = 0;
   std::uint64_t startAbsoluteTime_ = UINT64_MAX;

@@ -78,7 +78,7 @@ std::unique_ptr<Timeline> keptChain(std::vector<std::unique_ptr<BootTimeline>>& 
 
 }  // namespace
 
-void sortByAbsoluteTime(std::vector<RecordRef>& records) {
+void sortByAbsoluteTime(RecordList& records) {
   auto earlier = [](const RecordRef& a, const RecordRef& b) { return a.absoluteTime() < b.absoluteTime(); };
   if (std::is_sorted(records.begin(), records.end(), earlier)) return;
   std::stable_sort(records.begin(), records.end(), earlier);
@@ -93,7 +93,7 @@ std::map<std::string, std::unique_ptr<Timeline>> sequenceBoots(BootRecords& boot
 
   std::map<std::string, std::vector<std::unique_ptr<BootTimeline>>> bootsByVersion;
   for (const Uuid* uuid : uuids) {
-    std::vector<RecordRef>& records = bootRecords.at(*uuid);
+    RecordList& records = bootRecords.at(*uuid);
     sortByAbsoluteTime(records);
     std::optional<Uuid> lastUUID;
     std::string version = "<unknown>";

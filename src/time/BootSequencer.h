@@ -22,7 +22,7 @@ namespace bw {
 
 // The record reader's result: each boot's record handles (the records stay
 // where the reader keeps them for as long as the models live).
-using BootRecords = std::unordered_map<Uuid, std::vector<RecordRef>>;
+using BootRecords = std::unordered_map<Uuid, RecordList>;
 
 // Sorts each boot's records by absolute time (ties keep their order), builds
 // its BootTimeline (which takes over the boot's list) and returns the kept chain of each system
@@ -33,6 +33,6 @@ using BootRecords = std::unordered_map<Uuid, std::vector<RecordRef>>;
 std::map<std::string, std::unique_ptr<Timeline>> sequenceBoots(BootRecords& bootRecords);
 
 // Sorts records by absolute time; records with equal times keep their order.
-void sortByAbsoluteTime(std::vector<RecordRef>& records);
+void sortByAbsoluteTime(RecordList& records);
 
 }  // namespace bw

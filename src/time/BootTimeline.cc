@@ -7,7 +7,7 @@
 
 namespace bw {
 
-BootTimeline::BootTimeline(const Uuid& uuid, std::optional<Uuid> lastUUID, std::vector<RecordRef> events)
+BootTimeline::BootTimeline(const Uuid& uuid, std::optional<Uuid> lastUUID, RecordList events)
     : uuid_(uuid), lastUUID_(lastUUID), records_(std::move(events)) {
   if (records_.empty() || records_.front().recordClass() != RecordClass::LogStartsV1 || !records_.front().decoded()) {
     throw Exception(kInvalidArgumentException, "invalid event stream detected");

@@ -31,11 +31,11 @@ class BootTimeline : public Timeline {
   // kInvalidArgumentException "invalid event stream detected" unless the
   // first record is exactly a LogStartsV1 kept decoded.
   // The boot keeps `events`; its segments point into them.
-  BootTimeline(const Uuid& uuid, std::optional<Uuid> lastUUID, std::vector<RecordRef> events);
-  BootTimeline(const Uuid& uuid, std::vector<RecordRef> events) : BootTimeline(uuid, std::nullopt, std::move(events)) {}
+  BootTimeline(const Uuid& uuid, std::optional<Uuid> lastUUID, RecordList events);
+  BootTimeline(const Uuid& uuid, RecordList events) : BootTimeline(uuid, std::nullopt, std::move(events)) {}
   // The same over records kept decoded, which must outlive the timeline.
   BootTimeline(const Uuid& uuid, std::optional<Uuid> lastUUID, std::span<Record* const> events)
-      : BootTimeline(uuid, lastUUID, std::vector<RecordRef>(events.begin(), events.end())) {}
+      : BootTimeline(uuid, lastUUID, RecordList(events.begin(), events.end())) {}
   BootTimeline(const Uuid& uuid, std::span<Record* const> events) : BootTimeline(uuid, std::nullopt, events) {}
 
   const Uuid& uuid() const { return uuid_; }
@@ -55,7 +55,7 @@ class BootTimeline : public Timeline {
   Uuid uuid_;
   std::optional<Uuid> lastUUID_;
   std::optional<std::string> systemVersion_;
-  std::vector<RecordRef> records_;
+  RecordList records_;
 };
 
 }  // namespace bw

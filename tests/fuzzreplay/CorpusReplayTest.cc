@@ -43,7 +43,7 @@ struct Read {
     result = readStatsBuffers({StatsBuffer{bytesOf(bytes), bytes.size(), name}}, StoreQuery());
     setPlatform(nullptr);
   }
-  const std::vector<RecordRef>& onlyBoot() const { return result.boots.begin()->second; }
+  const RecordList& onlyBoot() const { return result.boots.begin()->second; }
 
   std::string bytes;
   fuzz::QuietPlatform log;
@@ -77,7 +77,7 @@ TEST(FuzzCorpus, EachTypeSeedReadsAsAHeaderAndRecordsOfItsType) {
     ++seeds;
     Read read(name);
     ASSERT_EQ(read.result.boots.size(), 1u);
-    const std::vector<RecordRef>& records = read.onlyBoot();
+    const RecordList& records = read.onlyBoot();
     ASSERT_GE(records.size(), 2u);
     EXPECT_EQ(records.front().recordClass(), RecordClass::LogStartsV1);
     for (std::size_t i = 1; i < records.size(); ++i) EXPECT_EQ(records[i].recordClass(), *c);
@@ -111,7 +111,7 @@ TEST(FuzzCorpus, DamagedSeedsAreReadAsTheReaderPromises) {
   {
     Read above("above-the-table");  // keys above the table reuse the class before
     ASSERT_EQ(above.result.boots.size(), 1u);
-    const std::vector<RecordRef>& records = above.onlyBoot();
+    const RecordList& records = above.onlyBoot();
     ASSERT_EQ(records.size(), 4u);
     for (std::size_t i = 1; i < records.size(); ++i) EXPECT_EQ(records[i].recordClass(), RecordClass::SleepWake);
   }

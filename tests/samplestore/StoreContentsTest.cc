@@ -52,7 +52,7 @@ const SharedStore& sharedStore() {
     s->report = generateSampleStore(s->config);
     s->read = readAllRecords(StoreQuery{.fromPath = s->config.output});
     for (const BootSummary& boot : s->report.boots) {
-      std::vector<RecordRef> refs = s->read.boots[boot.uuid];
+      RecordList refs = s->read.boots[boot.uuid];
       sortByAbsoluteTime(refs);
       auto& records = s->boots.emplace_back();
       for (const RecordRef& r : refs) records.push_back(s->owned.emplace_back(copyRecord(r)).get());

@@ -47,7 +47,7 @@ class RecordReader : public ::testing::Test {
   std::ostringstream out_, err_;
 };
 
-std::vector<std::uint64_t> times(const std::vector<RecordRef>& records) {
+std::vector<std::uint64_t> times(const RecordList& records) {
   std::vector<std::uint64_t> t;
   for (const RecordRef& r : records) t.push_back(r.absoluteTime());
   return t;
@@ -200,7 +200,7 @@ TEST_F(RecordReader, HandlesDecodeToWhatWasWrittenWithOnlyHeadersKeptDecoded) {
   w.append(sleepAt(300));
   w.append(idle(400));
   RecordsByBoot r = read({write("a.stats", w)});
-  const std::vector<RecordRef>& records = r.boots[bootNamed(1)];
+  const RecordList& records = r.boots[bootNamed(1)];
   ASSERT_EQ(records.size(), 4u);
   EXPECT_EQ(r.storage.kept.size(), 1u);
   EXPECT_EQ(r.storage.files.size(), 1u);

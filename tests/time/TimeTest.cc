@@ -456,7 +456,7 @@ TEST_F(TimeTest, ABootIsSortedByAbsoluteTimeKeepingTiesInOrderAndBeginsWithAVers
   EXPECT_EQ(std::tuple(named.uuid(), *named.lastUUID(), *named.systemVersion()), std::tuple(kA, kB, "23A344"));
   EXPECT_FALSE(unnamed.lastUUID().has_value() || unnamed.systemVersion().has_value());
   Record *last = idle(500), *early = idle(300), *late = idle(300), *first = header(0, kWall);
-  std::vector<RecordRef> refs{last, early, first, late};
+  RecordList refs{last, early, first, late};
   sortByAbsoluteTime(refs);
   std::vector<const Record*> order;
   for (const RecordRef& r : refs) order.push_back(r.decoded());
