@@ -158,6 +158,12 @@ void report(benchmark::State& state, std::size_t records) {
       benchmark::Counter(static_cast<double>(records), benchmark::Counter::kIsIterationInvariantRate);
 }
 
+// Wall time on one and on two threads, with the process's CPU time beside it.
+void onOneAndTwoThreads(benchmark::internal::Benchmark* b) {
+  b->Arg(1)->Arg(2)->ArgName("threads")->Unit(benchmark::kMillisecond)->MinTime(3.0);
+  b->MeasureProcessCPUTime()->UseRealTime();
+}
+
 // Reading only: letting go of the previous result (unmapping the files) is
 // not timed.
 void BM_RecordReader(benchmark::State& state) {
@@ -172,14 +178,7 @@ void BM_RecordReader(benchmark::State& state) {
   }
   report(state, records);
 }
-BENCHMARK(BM_RecordReader)
-    ->Arg(1)
-    ->Arg(2)
-    ->ArgName("threads")
-    ->Unit(benchmark::kMillisecond)
-    ->MinTime(3.0)
-    ->MeasureProcessCPUTime()
-    ->UseRealTime();
+BENCHMARK(BM_RecordReader)->Apply(onOneAndTwoThreads);
 
 // Reading plus one pass that decodes every record: what a run that reads
 // every record once pays.
@@ -192,14 +191,7 @@ void BM_RecordReaderAndOnePass(benchmark::State& state) {
   }
   report(state, records);
 }
-BENCHMARK(BM_RecordReaderAndOnePass)
-    ->Arg(1)
-    ->Arg(2)
-    ->ArgName("threads")
-    ->Unit(benchmark::kMillisecond)
-    ->MinTime(3.0)
-    ->MeasureProcessCPUTime()
-    ->UseRealTime();
+BENCHMARK(BM_RecordReaderAndOnePass)->Apply(onOneAndTwoThreads);
 
 void BM_ProtobufStatsFileOnArena(benchmark::State& state) {
   std::size_t records = 0;
