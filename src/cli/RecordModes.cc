@@ -65,15 +65,8 @@ void runEventListing(const Options& options) {
   runPerModel(options, [&](const Model& model, const std::vector<Range>& ranges) {
     OutputBuffer buffer(o);
     std::string& text = buffer.text();
-    // The date's text depends on the second alone; records come many a second.
-    std::uint64_t dateSecond = std::numeric_limits<std::uint64_t>::max();
-    std::string date;
     model.timeline().enumerateEventsInRelativeRanges(
         ranges, [&](const Record& event, std::uint64_t position, std::uint64_t wallTime, const AbsTime&, bool&) {
-          if (wallTime / 1000 != dateSecond) {
-            dateSecond = wallTime / 1000;
-            date = formatWallTime(wallTime);
-          }
           if (gDebug) {
             appendDecimal(text, static_cast<unsigned long long>(position));
             text += '\t';
@@ -81,7 +74,7 @@ void runEventListing(const Options& options) {
             text += '\t';
             text += event.answersWallTime() ? '*' : ' ';
           }
-          text += date;
+          text += formatWallTime(wallTime);  // made once per second
           text += '\t';
           if (!event.appendPrettyPrint(text)) text += event.className();
           text += '\n';
