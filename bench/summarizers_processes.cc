@@ -54,15 +54,13 @@ std::size_t feedAll(std::vector<std::unique_ptr<bw::ProcessSummarizer>>& summari
   return records;
 }
 
-// The processes, and the bytes their curves' samples take at 16 bytes a
-// sample (position and value).
-std::pair<std::size_t, std::size_t> processesAndPointBytes(
+// The processes, and their curves' samples.
+std::pair<std::size_t, std::size_t> processesAndSamples(
     std::vector<std::unique_ptr<bw::ProcessSummarizer>>& summarizers) {
   std::size_t n = 0, points = 0;
   const auto countPoints = [&](std::uint64_t, const std::shared_ptr<bw::Process>& p, bool&) {
-    for (bw::Interpolator* curve :
-         {&p->cpuTime(), &p->idle_wakeups(), &p->interrupts(), &p->pageins(), &p->residentSize(), &p->wired()})
-      points += curve->dataSet().count();
+    for (std::size_t c = 0; c < bw::ProcessSamples::kCurves; ++c)
+      points += p->curve(static_cast<bw::Process::CurveIndex>(c)).count();
   };
   for (auto& s : summarizers) {
     s->boots().enumerateKeysAndObjectsUsingBlock(
@@ -71,21 +69,21 @@ std::pair<std::size_t, std::size_t> processesAndPointBytes(
           boot->processes().enumerateKeysAndObjectsUsingBlock(countPoints);
         });
   }
-  return {n, points * 16};
+  return {n, points};
 }
 
 void BM_FeedProcessRecords(benchmark::State& state) {
   models();
   // The records and timelines alone, before any process state.
   state.counters["peak_MB_store_loaded"] = peakMB();
-  std::size_t records = 0, processes = 0, pointBytes = 0, heap = 0;
+  std::size_t records = 0, processes = 0, samples = 0, heap = 0;
   for (auto _ : state) {
     std::vector<std::unique_ptr<bw::ProcessSummarizer>> summarizers;
     const std::size_t before = heapInUse();
     records = feedAll(summarizers);
     heap = heapInUse() - before;
     state.PauseTiming();
-    std::tie(processes, pointBytes) = processesAndPointBytes(summarizers);
+    std::tie(processes, samples) = processesAndSamples(summarizers);
     summarizers.clear();
     state.ResumeTiming();
   }
@@ -95,7 +93,8 @@ void BM_FeedProcessRecords(benchmark::State& state) {
   state.counters["processes"] = static_cast<double>(processes);
   state.counters["heap_MB"] = static_cast<double>(heap) / 1048576.0;
   state.counters["bytes_per_process"] = static_cast<double>(heap) / static_cast<double>(processes);
-  state.counters["sample_bytes_per_process"] = static_cast<double>(pointBytes) / static_cast<double>(processes);
+  state.counters["samples"] = static_cast<double>(samples);
+  state.counters["heap_bytes_per_sample"] = static_cast<double>(heap) / static_cast<double>(samples);
   state.counters["process_object_bytes"] = sizeof(bw::Process);
 }
 
@@ -113,7 +112,7 @@ void BM_JobsAndOwnershipAtEndOfInput(benchmark::State& state) {
     heap = heapInUse() - before;
     jobs = 0;
     for (auto& s : summarizers) jobs += s->jobs().count();
-    processes = processesAndPointBytes(summarizers).first;
+    processes = processesAndSamples(summarizers).first;
     summarizers.clear();
     state.ResumeTiming();
   }

@@ -7,7 +7,7 @@
 
 namespace bw {
 
-void AggregateInterpolator::addInterpolator(std::shared_ptr<Interpolator> interpolator, const Uuid& boot) {
+void AggregateInterpolator::addInterpolator(std::shared_ptr<const Curve> interpolator, const Uuid& boot) {
   boots_.objectForKey(boot).add(std::move(interpolator));
 }
 

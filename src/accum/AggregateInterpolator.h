@@ -29,7 +29,7 @@ class AggregateInterpolator {
   AggregateInterpolator() : boots_(Boots::withClass()) {}
 
   // Adds `interpolator` to `boot`'s group (once, by identity).
-  void addInterpolator(std::shared_ptr<Interpolator> interpolator, const Uuid& boot);
+  void addInterpolator(std::shared_ptr<const Curve> interpolator, const Uuid& boot);
 
   // Sum of the members' valueAtPosition(time).
   double valueAtAbsoluteTime(const AbsTime& time) const;

@@ -27,14 +27,15 @@ double Interpolator::interpolateValueAtPosition(std::uint64_t position, std::int
       return std::numeric_limits<double>::quiet_NaN();
     case 1:
       return points[0].value;
-    default: {
-      const DataPoint& a = points[0];
-      const DataPoint& b = points[1];
-      double slope = (b.value - a.value) / static_cast<double>(b.position - a.position);
-      if (a.position <= position) return a.value + slope * static_cast<double>(position - a.position);
-      return a.value - slope * static_cast<double>(a.position - position);
-    }
+    default:
+      return lineValue(points[0], points[1], position);
   }
+}
+
+double Interpolator::lineValue(const DataPoint& a, const DataPoint& b, std::uint64_t position) {
+  double slope = (b.value - a.value) / static_cast<double>(b.position - a.position);
+  if (a.position <= position) return a.value + slope * static_cast<double>(position - a.position);
+  return a.value - slope * static_cast<double>(a.position - position);
 }
 
 void Interpolator::extrapolateValueAtPosition(std::uint64_t position) {

@@ -12,6 +12,7 @@
 #include <string>
 #include <vector>
 
+#include "accum/Curve.h"
 #include "accum/DataSet.h"
 #include "base/Range.h"
 
@@ -21,14 +22,14 @@ namespace bw {
 struct WithZero {};
 inline constexpr WithZero kWithZero{};
 
-class Interpolator {
+class Interpolator : public Curve {
  public:
   static constexpr const char* kClassName = "Interpolator";
 
   Interpolator() = default;
   // Holding the one sample (0, 0).
   explicit Interpolator(WithZero);
-  virtual ~Interpolator() = default;
+  ~Interpolator() override = default;
   Interpolator(const Interpolator&) = default;
   Interpolator& operator=(const Interpolator&) = default;
   Interpolator(Interpolator&&) = default;
@@ -40,11 +41,13 @@ class Interpolator {
 
   // Linear between samples, the edge sample's value outside them; NaN only
   // when there is no sample.
-  double valueAtPosition(std::uint64_t position) const;
+  double valueAtPosition(std::uint64_t position) const override;
   // The line through the samples that `DataSet::dataPoints` chooses for
   // (position, approach, hold), extended to `position` on either side;
   // one chosen sample gives its value, none gives NaN.
   double interpolateValueAtPosition(std::uint64_t position, std::int32_t approach, bool hold) const;
+  // The value at `position` on the line through samples `a` and `b`.
+  static double lineValue(const DataPoint& a, const DataPoint& b, std::uint64_t position);
   // Adds the value of the line through the last two samples (past the end)
   // or the two samples at or after `position` (otherwise), when there is
   // one, through `addValue` (so checks and truncation apply).
@@ -54,7 +57,7 @@ class Interpolator {
 
   // The data set's statistics (see DataSet).
   double maxValue() const { return dataSet_.maxValue(); }
-  double maxValueInRange(Range range) const { return dataSet_.maxValueInRange(range); }
+  double maxValueInRange(Range range) const override { return dataSet_.maxValueInRange(range); }
   double meanValueInRange(Range range) const { return dataSet_.meanValueInRange(range); }
   double medianValueInRange(Range range) const { return dataSet_.medianValueInRange(range); }
   double weightedMeanValueInRange(Range range) const { return dataSet_.weightedMeanValueInRange(range); }

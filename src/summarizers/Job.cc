@@ -9,12 +9,12 @@ void Job::addProcess(const std::shared_ptr<Process>& p, const Uuid& boot) {
   p->setJob(this);
   spawns_.addCreditAtAbsoluteTime(p->start_time());
   if (const std::optional<AbsTime> exit = p->exit_time()) spawns_.addDebitAtAbsoluteTime(*exit);
-  aggregateCPUTime_.addInterpolator(Process::share(p, &Process::cpuTime), boot);
-  aggregateIdleWakeups_.addInterpolator(Process::share(p, &Process::idle_wakeups), boot);
-  aggregateInterrupts_.addInterpolator(Process::share(p, &Process::interrupts), boot);
-  aggregatePageins_.addInterpolator(Process::share(p, &Process::pageins), boot);
-  aggregateResidentSize_.addInterpolator(Process::share(p, &Process::residentSize), boot);
-  aggregateWired_.addInterpolator(Process::share(p, &Process::wired), boot);
+  aggregateCPUTime_.addInterpolator(Process::share(p, Process::kCpuTime), boot);
+  aggregateIdleWakeups_.addInterpolator(Process::share(p, Process::kIdleWakeups), boot);
+  aggregateInterrupts_.addInterpolator(Process::share(p, Process::kInterrupts), boot);
+  aggregatePageins_.addInterpolator(Process::share(p, Process::kPageins), boot);
+  aggregateResidentSize_.addInterpolator(Process::share(p, Process::kResidentSize), boot);
+  aggregateWired_.addInterpolator(Process::share(p, Process::kWired), boot);
 }
 
 void Job::addOwnedProcessToUmbrella(const std::shared_ptr<Process>& p, const Uuid& boot) {
@@ -23,9 +23,9 @@ void Job::addOwnedProcessToUmbrella(const std::shared_ptr<Process>& p, const Uui
     const std::string* jobLabel = p->job() ? p->job()->label() : nullptr;
     err() << format("%s[%u] has owner %s", textOrNull(jobLabel), p->pid(), textOrNull(label())) << "\n";
   }
-  umbrellaCPUTime_.addInterpolator(Process::share(p, &Process::cpuTime), boot);
-  umbrellaIdleWakeups_.addInterpolator(Process::share(p, &Process::idle_wakeups), boot);
-  umbrellaInterrupts_.addInterpolator(Process::share(p, &Process::interrupts), boot);
+  umbrellaCPUTime_.addInterpolator(Process::share(p, Process::kCpuTime), boot);
+  umbrellaIdleWakeups_.addInterpolator(Process::share(p, Process::kIdleWakeups), boot);
+  umbrellaInterrupts_.addInterpolator(Process::share(p, Process::kInterrupts), boot);
 }
 
 void Job::mergeJob(const Job& other) {

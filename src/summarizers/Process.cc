@@ -11,9 +11,15 @@ std::optional<AbsTime> Process::exit_time() const {
   return AbsTime{boot_, exit_};
 }
 
-void Process::shrinkToFit() {
-  for (Interpolator* curve : {&cpuTime_, &idleWakeups_, &interrupts_, &pageins_, &residentSize_, &wired_})
-    curve->shrinkToFit();
+Process::Process()
+    : curves_{ProcessCurve(samples_, kCpuTime),      ProcessCurve(samples_, kIdleWakeups),
+              ProcessCurve(samples_, kInterrupts),   ProcessCurve(samples_, kPageins),
+              ProcessCurve(samples_, kResidentSize), ProcessCurve(samples_, kWired)} {}
+
+void Process::addSample(CurveIndex curve, double value, std::uint64_t position) {
+  Row row{};
+  row[curve] = value;
+  samples_.addRow(position, 1u << curve, row);
 }
 
 Value Process::objectForKeyedSubscript(const std::string& key) const {

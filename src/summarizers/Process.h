@@ -6,33 +6,53 @@
 // `interrupts` and `pageins` are cumulative counts; `residentSize` and
 // `wired` are levels in bytes.
 //
-// Memory: a store holds hundreds of thousands of processes, so a process is
-// its curves plus a few scalars. Label and display name are shared texts
+// Memory: a store holds tens of thousands of processes and close to a
+// million samples, so a process is its packed samples (ProcessSamples) plus
+// a few scalars. Label and display name are shared texts
 // (see JobNames); `stats` is made only when written; the boot is kept once
 // for both times. Jobs add the curves to their aggregates through aliasing
 // pointers that keep the process alive, not through copies.
+#include <array>
 #include <cstdint>
 #include <map>
 #include <memory>
 #include <optional>
 #include <string>
 
-#include "accum/Interpolator.h"
+#include "accum/Curve.h"
 #include "base/Uuid.h"
 #include "base/Value.h"
 #include "summarizers/JobName.h"
+#include "summarizers/ProcessSamples.h"
 #include "time/AbsTime.h"
 
 namespace bw {
 
 class Job;
 
+// One of a process's curves, answering from the process's samples.
+class ProcessCurve final : public Curve {
+ public:
+  ProcessCurve(const ProcessSamples& samples, std::size_t index) : samples_(&samples), index_(index) {}
+  double valueAtPosition(std::uint64_t position) const override { return samples_->valueAtPosition(index_, position); }
+  double maxValueInRange(Range range) const override { return samples_->maxValueInRange(index_, range); }
+  std::size_t count() const { return samples_->count(index_); }
+
+ private:
+  const ProcessSamples* samples_;
+  std::size_t index_;
+};
+
 class Process {
  public:
   static constexpr const char* kClassName = "Process";
   using Name = JobNames::Name;
 
-  Process() = default;
+  // The curves, in the order of a sample row's values.
+  enum CurveIndex : std::size_t { kCpuTime, kIdleWakeups, kInterrupts, kPageins, kResidentSize, kWired };
+  using Row = std::array<double, ProcessSamples::kCurves>;
+
+  Process();
   Process(const Process&) = delete;
   Process& operator=(const Process&) = delete;
 
@@ -76,21 +96,22 @@ class Process {
   // `t` must be on the process's boot (every caller's is).
   void setExit_time(const AbsTime& t) { exit_ = t.time, hasExit_ = true; }
 
-  Interpolator& cpuTime() { return cpuTime_; }
-  Interpolator& idle_wakeups() { return idleWakeups_; }
-  Interpolator& interrupts() { return interrupts_; }
-  Interpolator& pageins() { return pageins_; }
-  Interpolator& residentSize() { return residentSize_; }
-  Interpolator& wired() { return wired_; }
-  const Interpolator& cpuTime() const { return cpuTime_; }
-  const Interpolator& residentSize() const { return residentSize_; }
+  // Adds one sample row at `position`: `row[c]` for each curve c whose bit
+  // (1 << c) is set in `present`.
+  void addSamples(std::uint64_t position, unsigned present, const Row& row) { samples_.addRow(position, present, row); }
+  // Adds one sample to one curve.
+  void addSample(CurveIndex curve, double value, std::uint64_t position);
 
-  // Gives back the curves' spare sample capacity (at the end of input).
-  void shrinkToFit();
+  const ProcessCurve& curve(CurveIndex c) const { return curves_[c]; }
+  const ProcessCurve& cpuTime() const { return curves_[kCpuTime]; }
+  const ProcessCurve& wired() const { return curves_[kWired]; }
+
+  // Gives back the samples' spare capacity (at the end of input).
+  void shrinkToFit() { samples_.shrinkToFit(); }
 
   // A curve of `self` that shares ownership of the whole process.
-  static std::shared_ptr<Interpolator> share(const std::shared_ptr<Process>& self, Interpolator& (Process::*curve)()) {
-    return std::shared_ptr<Interpolator>(self, &((*self).*curve)());
+  static std::shared_ptr<const Curve> share(const std::shared_ptr<Process>& self, CurveIndex c) {
+    return std::shared_ptr<const Curve>(self, &self->curves_[c]);
   }
 
   // Further per-process values by key; absent keys read as null values.
@@ -119,12 +140,8 @@ class Process {
   Job* job_ = nullptr;
   Job* owner_ = nullptr;
   std::unique_ptr<std::map<std::string, Value>> stats_;
-  Interpolator cpuTime_;
-  Interpolator idleWakeups_;
-  Interpolator interrupts_;
-  Interpolator pageins_;
-  Interpolator residentSize_;
-  Interpolator wired_;
+  ProcessSamples samples_;
+  std::array<ProcessCurve, ProcessSamples::kCurves> curves_;
 };
 
 }  // namespace bw

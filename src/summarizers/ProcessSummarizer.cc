@@ -51,9 +51,7 @@ void ProcessSummarizer::addProcessUsage(const ProcessUsage& record, ProcessBootC
     if (record.hasName()) p->setCleanedLabel(names_.cleanedLabel(record.name()));
     if (record.hasDisplayName()) p->setDisplayName(names_.shared(record.displayName()));
     p->setStart_time(AbsTime{absTime.boot, record.procStartAbstime()});
-    for (Interpolator* curve :
-         {&p->cpuTime(), &p->idle_wakeups(), &p->interrupts(), &p->pageins(), &p->residentSize(), &p->wired()})
-      curve->addValue(0, record.procStartAbstime());
+    p->addSamples(record.procStartAbstime(), (1u << ProcessSamples::kCurves) - 1, Process::Row{});
     if (status == kGone) context.processes().removeObjectForKey(record.uniqueid());
   }
   if (const std::optional<Uuid> uuid = record.UUID(); uuid && status != kSnapshot) p->setMacho_uuid(*uuid);
@@ -67,13 +65,20 @@ void ProcessSummarizer::addProcessUsage(const ProcessUsage& record, ProcessBootC
     }
     return;
   }
-  if (record.hasUserTime() || record.hasSystemTime())
-    p->cpuTime().addValue(static_cast<double>(record.userTime() + record.systemTime()), t);
-  if (record.hasInterruptWkups()) p->interrupts().addValue(static_cast<double>(record.interruptWkups()), t);
-  if (record.hasPkgIdleWkups()) p->idle_wakeups().addValue(static_cast<double>(record.pkgIdleWkups()), t);
-  if (record.hasPageins()) p->pageins().addValue(static_cast<double>(record.pageins()), t);
-  if (record.residentSize() != 0) p->residentSize().addValue(static_cast<double>(record.residentSize()), t);
+  Process::Row row{};
+  unsigned present = 0;
+  const auto take = [&](Process::CurveIndex c, bool has, std::uint64_t value) {
+    if (!has) return;
+    row[c] = static_cast<double>(value);
+    present |= 1u << c;
+  };
+  take(Process::kCpuTime, record.hasUserTime() || record.hasSystemTime(), record.userTime() + record.systemTime());
+  take(Process::kInterrupts, record.hasInterruptWkups(), record.interruptWkups());
+  take(Process::kIdleWakeups, record.hasPkgIdleWkups(), record.pkgIdleWkups());
+  take(Process::kPageins, record.hasPageins(), record.pageins());
+  take(Process::kResidentSize, record.residentSize() != 0, record.residentSize());
   // `wired` keeps only its initial 0 on purpose.
+  p->addSamples(t, present, row);
 
   if (status != kStillRunning && status != kSnapshot) p->setExit_time(AbsTime{absTime.boot, record.procExitAbstime()});
 }

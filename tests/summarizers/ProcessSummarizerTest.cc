@@ -106,7 +106,7 @@ TEST_F(ProcessAccounting, FeedingKeepsExitsUuidsAndWiredAsRecordsAllow) {
   EXPECT_EQ(late->cpuTime().valueAtPosition(1000), 5 * kMs);
   EXPECT_EQ(late->exit_time()->time, 100u);
   EXPECT_FALSE(process(s, 21)->exit_time());
-  EXPECT_EQ(process(s, 21)->wired().dataSet().count(), 1u);
+  EXPECT_EQ(process(s, 21)->wired().count(), 1u);
 
   // A new boot ends every process of the previous one at its last record
   // time + 1, known exits included.
@@ -314,9 +314,9 @@ TEST(ProcessSummary, SubprocessesSortLargestFirstByEachComparison) {
 
 TEST(JobGraph, RowsMarkColumnsAboveEachThreshold) {
   auto p = std::make_shared<Process>();
-  p->cpuTime().addValue(0, 0);
-  p->cpuTime().addValue(2.5e9, 500);           // 5 per column for the first half
-  p->cpuTime().addValue(2.5e9 + 2.5e7, 1000);  // 0.05 per column after
+  p->addSample(Process::kCpuTime, 0, 0);
+  p->addSample(Process::kCpuTime, 2.5e9, 500);           // 5 per column for the first half
+  p->addSample(Process::kCpuTime, 2.5e9 + 2.5e7, 1000);  // 0.05 per column after
   Job job;
   job.addProcess(p, boot(1));
   const std::string graph = job.graphOverRange(AbsRange::rangeWithBoot(boot(1), 0, 1000));
@@ -341,8 +341,8 @@ TEST(JobGraph, RowsMarkColumnsAboveEachThreshold) {
 TEST(JobMerge, AMergedJobAnswersForBothAndKeepsItsOwnNames) {
   auto p = std::make_shared<Process>(), q = std::make_shared<Process>();
   p->setStart_time({boot(1), 0}), q->setStart_time({boot(1), 50});
-  p->cpuTime().addValue(0, 0), p->cpuTime().addValue(1e6, 100);
-  q->cpuTime().addValue(0, 50), q->cpuTime().addValue(3e6, 100);
+  p->addSample(Process::kCpuTime, 0, 0), p->addSample(Process::kCpuTime, 1e6, 100);
+  q->addSample(Process::kCpuTime, 0, 50), q->addSample(Process::kCpuTime, 3e6, 100);
   Job a, b;
   a.addProcess(p, boot(1));
   b.addProcess(q, boot(1));
