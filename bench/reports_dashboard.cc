@@ -63,7 +63,7 @@ BENCHMARK(BM_LoadModels)->Unit(benchmark::kMillisecond)->MinTime(5.0);
 
 void BM_LoadAndFeedModels(benchmark::State& state) {
   for (auto _ : state) {
-    for (const auto& model : bw::loadModels(options())) model->processEventsWithDomains({}, true);
+    for (const auto& model : bw::loadModels(options())) model->processEventsWithDomains({});
   }
 }
 BENCHMARK(BM_LoadAndFeedModels)->Unit(benchmark::kMillisecond)->MinTime(5.0);

@@ -69,7 +69,7 @@ void reportModel(Model& model, const std::vector<YearMonthDay>& days, bool build
     dayDomains.push_back(std::make_unique<DateDomain>(day));
     domains.push_back(dayDomains.back().get());
   }
-  model.processEventsWithDomains(domains, true);
+  model.processEventsWithDomains(domains);
 
   std::vector<Range> postInstallRanges;
   if (postInstall && !postInstall->ranges().empty()) {

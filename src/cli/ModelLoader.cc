@@ -28,8 +28,20 @@ DomainChoice domainChoice(const Options& options) {
   return choice;
 }
 
-bool feedsSummarizers(const Options& options) {
-  return options.mode() != kModeDump && options.mode() != kModeShowEvents;
+SummarizerFeed summarizerFeed(const Options& options) {
+  switch (options.mode()) {
+    case kModeDump:
+    case kModeShowEvents:
+      return SummarizerFeed::only({});
+    case kModeShowBattery: {
+      if (gDebug) return SummarizerFeed::all();
+      std::vector<std::string> keys = options.domain_mask_states().value_or(std::vector<std::string>{});
+      keys.push_back("Power");
+      return SummarizerFeed::only(std::move(keys));
+    }
+    default:
+      return SummarizerFeed::all();
+  }
 }
 
 FileList runFileList(const StoreQuery& query, ReadObserver* observer) {

@@ -1,25 +1,27 @@
 #pragma once
 // The command line's edge: translates `Options` into what the lower stages
-// take (the store's query, the domain's choice, whether summarizers are fed)
+// take (the store's query, the domain's choice, which summarizers are fed)
 // and builds the models of a run from them.
 #include <memory>
 #include <vector>
 
 #include "domains/DomainChoice.h"
+#include "model/Model.h"
 #include "store/StatsFileList.h"
 #include "store/StoreQuery.h"
 
 namespace bw {
 
-class Model;
 class Options;
 class StoreWatch;
 
 StoreQuery storeQuery(const Options& options);
 DomainChoice domainChoice(const Options& options);
-// Whether the mode reads summarizers: the record dump and the event listing
-// need only the domains.
-bool feedsSummarizers(const Options& options);
+// The summarizers the mode reads: none for the record dump and the event
+// listing (they need only the domains); for the battery plot the battery's
+// and the -S states' (all with --debug, whose diagnostics come from every
+// summarizer); all for the rest.
+SummarizerFeed summarizerFeed(const Options& options);
 
 // The stats files of the run. A `--from` directory without any ends the run
 // with "--from path contained no Brindlewick trace files." (status 66).

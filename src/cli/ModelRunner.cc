@@ -43,7 +43,7 @@ void runPerModel(const Options& options, const ModelAction& action) {
       postInstall = std::make_unique<PostInstallDomain>();
       domains.push_back(postInstall.get());
     }
-    model->processEventsWithDomains(domains, feedsSummarizers(options));
+    model->processEventsWithDomains(domains, summarizerFeed(options));
 
     reached = std::max(reached, EmptyStage::kNoRange);
     if (domain->ranges().empty()) continue;

@@ -33,7 +33,7 @@ void runRecordDump(const Options& options) {
   for (const std::unique_ptr<Model>& model : models) {
     if (!printed) watch.step(format("feeding model %zu of %zu", ++fed, models.size()));
     std::unique_ptr<Domain> domain = Domain::domainWithChoice(domainChoice(options));
-    model->processEventsWithDomains({domain.get()}, feedsSummarizers(options));
+    model->processEventsWithDomains({domain.get()}, summarizerFeed(options));
     reached = EmptyStage::kNoRange;
     if (domain->ranges().empty()) continue;
     std::optional<Uuid> shownBoot;  // starts afresh for every model

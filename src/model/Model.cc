@@ -21,10 +21,14 @@ Model::Model(std::unique_ptr<Timeline> timeline, std::string systemVersion)
 
 Model::~Model() = default;
 
-void Model::processEventsWithDomains(const std::vector<Summarizer*>& domains, bool feedSummarizers) {
+bool SummarizerFeed::reaches(const std::string& key) const {
+  return !keys || std::find(keys->begin(), keys->end(), key) != keys->end();
+}
+
+void Model::processEventsWithDomains(const std::vector<Summarizer*>& domains, const SummarizerFeed& feed) {
   std::vector<Summarizer*> all;
-  if (feedSummarizers) {
-    for (auto& [key, summarizer] : summarizers_) all.push_back(summarizer.get());
+  for (auto& [key, summarizer] : summarizers_) {
+    if (feed.reaches(key)) all.push_back(summarizer.get());
   }
   const std::size_t summarizerCount = all.size();
   all.insert(all.end(), domains.begin(), domains.end());

@@ -22,6 +22,17 @@ class ProcessSummary;
 class DeviceSummarizer;
 struct RecordStorage;
 
+// The summarizers a feed reaches: every one, or only those under `keys`
+// (none when the list is empty). A mode that reads a few summarizers spares
+// the others' work and memory.
+struct SummarizerFeed {
+  std::optional<std::vector<std::string>> keys;
+
+  static SummarizerFeed all() { return {}; }
+  static SummarizerFeed only(std::vector<std::string> keys) { return {std::move(keys)}; }
+  bool reaches(const std::string& key) const;
+};
+
 class Model {
  public:
   Model(std::unique_ptr<Timeline> timeline, std::string systemVersion);
@@ -32,10 +43,11 @@ class Model {
   const std::string& systemVersion() const { return systemVersion_; }
   const Timeline& timeline() const { return *timeline_; }
 
-  // Feeds every record in timeline order to every summarizer (when
-  // `feedSummarizers`; the record listings need only the domains) and then
-  // to every domain, then tells each the last position.
-  void processEventsWithDomains(const std::vector<Summarizer*>& domains, bool feedSummarizers);
+  // Feeds every record in timeline order to the summarizers that `feed`
+  // reaches and then to every domain, then tells every summarizer and
+  // domain the last position.
+  void processEventsWithDomains(const std::vector<Summarizer*>& domains,
+                                const SummarizerFeed& feed = SummarizerFeed::all());
 
   // The summarizer under `key`, or null.
   Summarizer* summarizer(const std::string& key) const;

@@ -27,7 +27,7 @@ MessageDictionary batteryChargeGraph(StoreQuery query) {
   if (models.size() != 1) throw Exception(kInternalInconsistencyException, "multiple system versions detected");
   Model& model = *models.front();
   AllDomain domain;
-  model.processEventsWithDomains({&domain}, true);
+  model.processEventsWithDomains({&domain}, SummarizerFeed::only({"Power"}));  // the graph reads no other
   const auto* battery = dynamic_cast<const BatterySummarizer*>(model.summarizer("Power"));
   if (!battery) throw Exception(kInvalidArgumentException, "BatterySummarizer is nil");
 

@@ -45,7 +45,7 @@ ModelRanges modelInDomain(const StoreQuery& query, const DomainChoice& choice) {
   ModelRanges found;
   for (std::unique_ptr<Model>& model : loadStoreModels(query)) {
     std::unique_ptr<Domain> domain = Domain::domainWithChoice(choice);
-    model->processEventsWithDomains({domain.get()}, true);
+    model->processEventsWithDomains({domain.get()});
     if (domain->ranges().empty()) continue;
     if (found.model) throw Exception(kInternalInconsistencyException, "multiple system versions detected");
     found.ranges = domain->ranges();

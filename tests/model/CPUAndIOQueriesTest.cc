@@ -48,7 +48,7 @@ class CPUAndIOQueries : public ::testing::Test {
     options.setFrom_path(dir.path());
     models = loadModels(options);
     ASSERT_EQ(models.size(), 1u);
-    models[0]->processEventsWithDomains({}, true);
+    models[0]->processEventsWithDomains({});
   }
   test::TempDir dir;
   Options options;

@@ -309,7 +309,7 @@ TEST_F(Dashboard, RangeWithoutAbsoluteTimeLeavesTheIOSectionOut) {
   options.setFrom_path(laptop->path());
   std::vector<std::unique_ptr<Model>> models = loadModels(options);
   ASSERT_EQ(models.size(), 1u);
-  models[0]->processEventsWithDomains({}, true);
+  models[0]->processEventsWithDomains({});
   std::ostringstream o;
   printDashboard(o, DashboardSettings{}, *models[0], {{4000000, 1000}});
   EXPECT_TRUE(has(o.str(), "          Total Time:\t00:00:01"));

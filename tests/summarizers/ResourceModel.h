@@ -22,7 +22,7 @@ class ResourceModel {
     std::vector<std::unique_ptr<Timeline>> boots;
     boots.push_back(std::make_unique<BootTimeline>(bootNamed(7), pointers));
     model_ = std::make_unique<Model>(Timeline::timelineWithTimelines(std::move(boots)), "22A100");
-    model_->processEventsWithDomains({}, true);
+    model_->processEventsWithDomains({});
   }
   Model& model() { return *model_; }
 
