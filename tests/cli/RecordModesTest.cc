@@ -136,39 +136,29 @@ TEST_F(RecordModes, BatteryPlotMapsSleepsAndPowerSourcesAndHonoursMaskStates) {
   EXPECT_EQ(run({"-b", "21B5", "-S", "Battery", "--show-battery"}).out, "");
 }
 
+// Boot C's header as the dump prints it.
+std::string bootCHeader(const std::string& abs, const std::string& wall) {
+  return "LogStartsV1 {\n    absoluteTime = " + abs +
+         ";\n"
+         "    bootUuid = <cccccccc 00000000 00000000 00000003>;\n"
+         "    lastBootUuid = <bbbbbbbb 00000000 00000000 00000002>;\n"
+         "    lastSystemVersion = 20A1;\n    systemVersion = 21B5;\n    version = 1;\n    wallTime = " +
+         wall + ";\n    writer = 1;\n}\n";
+}
+
 TEST_F(RecordModes, DumpPrintsEachRecordsDictionaryUnderItsBoot) {
   test::ToolResult r = run({"--dump", "-b", "21B5", "-S", "Sleep", "-I"});
   EXPECT_EQ(r.status, 0);
   EXPECT_EQ(r.err, "");
-  EXPECT_EQ(r.out,
-            "===== Boot CCCCCCCC-0000-0000-0000-000000000003 =====\n"
-            "LogStartsV1 {\n"
-            "    absoluteTime = 100;\n"
-            "    bootUuid = <cccccccc 00000000 00000000 00000003>;\n"
-            "    lastBootUuid = <bbbbbbbb 00000000 00000000 00000002>;\n"
-            "    lastSystemVersion = 20A1;\n"
-            "    systemVersion = 21B5;\n"
-            "    version = 1;\n"
-            "    wallTime = 1704069000100;\n"
-            "    writer = 1;\n"
-            "}\n"
-            "DeviceChange {\n"
-            "    absoluteTime = 200;\n"
-            "    deviceId = wlan0;\n"
-            "    deviceName = Wi-Fi;\n"
-            "    deviceType = 5;\n"
-            "    nowConnected = 1;\n"
-            "}\n"
-            "LogStartsV1 {\n"
-            "    absoluteTime = 4000000;\n"
-            "    bootUuid = <cccccccc 00000000 00000000 00000003>;\n"
-            "    lastBootUuid = <bbbbbbbb 00000000 00000000 00000002>;\n"
-            "    lastSystemVersion = 20A1;\n"
-            "    systemVersion = 21B5;\n"
-            "    version = 1;\n"
-            "    wallTime = 1704073000000;\n"
-            "    writer = 1;\n"
-            "}\n");
+  EXPECT_EQ(r.out, "===== Boot CCCCCCCC-0000-0000-0000-000000000003 =====\n" + bootCHeader("100", "1704069000100") +
+                       "DeviceChange {\n"
+                       "    absoluteTime = 200;\n"
+                       "    deviceId = wlan0;\n"
+                       "    deviceName = Wi-Fi;\n"
+                       "    deviceType = 5;\n"
+                       "    nowConnected = 1;\n"
+                       "}\n" +
+                       bootCHeader("4000000", "1704073000000"));
 }
 
 TEST_F(RecordModes, DumpStartsABootHeaderAgainForEveryModelAndSkipsEmptyOnes) {

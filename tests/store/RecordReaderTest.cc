@@ -55,13 +55,6 @@ std::vector<std::uint64_t> times(const RecordList& records) {
   return t;
 }
 
-TEST_F(RecordReader, EmptyFileContributesNothingAndSaysNothing) {
-  RecordsByBoot r = read({write("empty.stats", StatsFileWriter())});
-  EXPECT_TRUE(r.boots.empty());
-  EXPECT_EQ(debugText(), "");
-  EXPECT_TRUE(fake.systemLogLines.empty());
-}
-
 TEST_F(RecordReader, RecordsEarlierThanTheLatestHeaderAreDiscarded) {
   StatsFileWriter w;
   w.append(header(bootNamed(1), 100));
@@ -75,29 +68,33 @@ TEST_F(RecordReader, RecordsEarlierThanTheLatestHeaderAreDiscarded) {
   EXPECT_EQ(times(r.boots[bootNamed(1)]), (std::vector<std::uint64_t>{100, 100, 500, 500, 600}));
 }
 
-TEST_F(RecordReader, VersionZeroAnywhereDropsTheWholeFile) {
-  StatsFileWriter w;
-  w.append(header(bootNamed(1), 100));
-  w.append(idle(200));
-  LogStartsV0 v0;
-  v0.setVersion("0");
-  v0.setAbsoluteTime(300);
-  w.append(v0);
-  std::string path = write("v0.stats", w);
-  RecordsByBoot r = read({path});
-  EXPECT_TRUE(r.boots.empty());
-  EXPECT_EQ(debugText(), "Skipping (Version 0): " + path + "\n");
-  EXPECT_TRUE(r.storage.kept.empty() && r.storage.files.empty());
-}
-
-TEST_F(RecordReader, AFileNotStartingWithAHeaderIsDropped) {
-  StatsFileWriter w;
-  w.append(idle(50), 0);  // no class: skipped silently, the header is still awaited
-  w.append(sleepAt(100));
-  w.append(header(bootNamed(1), 100));
-  std::string path = write("bad.stats", w);
-  EXPECT_TRUE(read({path}).boots.empty());
-  EXPECT_EQ(debugText(), "Skipping (Malformed File <SleepWake>): " + path + "\n");
+// Files dropped whole, each with the debug line that says why: a version-0
+// record anywhere, a record before the first header (records of no class are
+// skipped while the header is awaited); an empty file says nothing at all.
+TEST_F(RecordReader, DroppedFilesSayWhyInTheDebugText) {
+  StatsFileWriter empty, v0, headless;
+  v0.append(header(bootNamed(1), 100));
+  v0.append(idle(200));
+  LogStartsV0 version0;
+  version0.setVersion("0");
+  version0.setAbsoluteTime(300);
+  v0.append(version0);
+  headless.append(idle(50), 0);
+  headless.append(sleepAt(100));
+  headless.append(header(bootNamed(1), 100));
+  const std::tuple<const char*, const StatsFileWriter&, std::string> cases[] = {
+      {"empty.stats", empty, ""},
+      {"v0.stats", v0, "Skipping (Version 0): "},
+      {"bad.stats", headless, "Skipping (Malformed File <SleepWake>): "}};
+  for (const auto& [name, w, why] : cases) {
+    SCOPED_TRACE(name);
+    console.err.str("");
+    const std::string path = write(name, w);
+    const RecordsByBoot r = read({path});
+    EXPECT_TRUE(r.boots.empty() && r.storage.kept.empty() && r.storage.files.empty());
+    EXPECT_EQ(debugText(), why.empty() ? "" : why + path + "\n");
+    EXPECT_TRUE(!why.empty() || fake.systemLogLines.empty());  // the empty file comes first
+  }
 }
 
 TEST_F(RecordReader, UnknownTypesAreLoggedOncePerFileWithTheKeyShiftedBySix) {
