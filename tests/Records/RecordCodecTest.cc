@@ -11,6 +11,7 @@
 #include "Records/PackageEnergyStatistics.h"
 #include "Records/SystemIO.h"
 #include "base/Exception.h"
+#include "support/Thrown.h"
 
 namespace bw {
 namespace {
@@ -265,12 +266,8 @@ TEST(RecordCopyTo, CopiesRequiredScalarsAndPresentFieldsAndKeepsTheTargetsOthers
     build(c.recordClass, c.source)->copyTo(*target);
     EXPECT_TRUE(target->isEqual(*build(c.recordClass, c.expected))) << target->description();
   }
-  try {
-    makeRecord(C::DateChange)->copyTo(*makeRecord(C::TimeChange));
-    ADD_FAILURE() << "copied into another class";
-  } catch (const Exception& e) {
-    EXPECT_EQ(e.name(), kInvalidArgumentException);
-  }
+  test::thrown([] { makeRecord(C::DateChange)->copyTo(*makeRecord(C::TimeChange)); }, kInvalidArgumentException,
+               "copyTo: a DateChange cannot be copied into a TimeChange");
 }
 
 }  // namespace

@@ -18,20 +18,13 @@ inline const Uuid kBootB = *Uuid::parse("BBBBBBBB-0000-0000-0000-000000000002");
 inline const Uuid kBootC = *Uuid::parse("CCCCCCCC-0000-0000-0000-000000000003");
 inline constexpr std::uint64_t kJan1 = 1704067200000;  // 2024-01-01 00:00:00 UTC
 
-// A gauge sample of the store's battery.
-inline BatteryChargeLevel gauge(std::uint64_t abs, std::int64_t charge, std::int64_t voltage) {
-  BatteryChargeLevel b = level(charge, 5000, voltage, abs);
-  b.setCycleCount(12);
-  return b;
-}
-
 inline void writeRecordModesStore(const TempDir& dir) {
   StatsFileWriter a;
   a.append(logStart(kBootA, 1000, kJan1 + 1000, "20A1"));
   a.append(zoneChange("UTC", 0, 2000, kJan1 + 2000));
   a.append(powerChange(PowerStateChange::kOnBattery, 4000, kJan1 + 4000));
-  a.append(gauge(3000, 4000, 12000));
-  a.append(gauge(63000, 3900, 11800));
+  a.append(gaugeAt(3000, 4000, 12000));
+  a.append(gaugeAt(63000, 3900, 11800));
   a.append(sleepWake(70000, kJan1 + 70000, SleepWake::kSleep));
   a.append(sleepWake(71000, kJan1 + 671000, SleepWake::kDarkWake, "EC.LidOpen", true));
   a.append(idle(72000, UserIdle::kIdle));
@@ -39,8 +32,8 @@ inline void writeRecordModesStore(const TempDir& dir) {
 
   StatsFileWriter b;
   b.append(logStart(kBootB, 500, kJan1 + 900500, "20A1", &kBootA, "20A1"));
-  b.append(gauge(1500, 3800, 11700));
-  b.append(gauge(11500, 3700, 11600));
+  b.append(gaugeAt(1500, 3800, 11700));
+  b.append(gaugeAt(11500, 3700, 11600));
   b.append(powerChange(PowerStateChange::kOnAC, 12000, 0, true));
   b.writeTo(dir.write("var/db/brindlewick/B.stats"));
 

@@ -53,7 +53,6 @@ TEST_F(ReportState, AKilledWriterLeavesTheOldOrTheNewFile) {
   ASSERT_TRUE(writePropertyListFile(path, first));
   std::mt19937 random(20240101);
   std::uniform_int_distribution<int> delay(0, 3000);
-  int kills = 0;
   for (int i = 0; i < 200; ++i) {
     const pid_t child = fork();
     ASSERT_GE(child, 0);
@@ -65,16 +64,10 @@ TEST_F(ReportState, AKilledWriterLeavesTheOldOrTheNewFile) {
     int status = 0;
     ASSERT_EQ(waitpid(child, &status, 0), child);
     ASSERT_TRUE(WIFSIGNALED(status) && WTERMSIG(status) == SIGKILL);
-    ++kills;
     const std::optional<Value> read = readPropertyList(path);
     ASSERT_TRUE(read) << "kill " << i;
     ASSERT_TRUE(*read == first || *read == second) << "kill " << i;
   }
-  std::size_t leftovers = 0;
-  for (const auto& entry : std::filesystem::directory_iterator(fake.ownStoreDirectory()))
-    leftovers += entry.path().filename() != "state.plist";
-  std::printf("kills: %d, temporary files left by killed writers: %zu\n", kills, leftovers);
-  EXPECT_EQ(kills, 200);
 }
 
 }  // namespace

@@ -10,6 +10,7 @@
 #include "base/Terminal.h"
 #include "cli/StoreWatch.h"
 #include "store/RecordReader.h"
+#include "support/ConsoleCapture.h"
 #include "support/FakePlatform.h"
 
 namespace bw {
@@ -17,16 +18,8 @@ namespace {
 
 class StoreWatchTest : public ::testing::Test {
  protected:
-  void SetUp() override {
-    setConsole(&out, &err);
-    setErrIsTerminal(true);
-    resetRunDamage();
-  }
-  void TearDown() override {
-    setConsole(nullptr, nullptr);
-    setErrIsTerminal(std::nullopt);
-    resetRunDamage();
-  }
+  void SetUp() override { setErrIsTerminal(true), resetRunDamage(); }
+  void TearDown() override { setErrIsTerminal(std::nullopt), resetRunDamage(); }
   FileRecords records(std::size_t n) {
     FileRecords f;
     for (std::size_t i = 0; i < n; ++i) f.records.push_back(&header);
@@ -34,7 +27,8 @@ class StoreWatchTest : public ::testing::Test {
   }
   test::FakePlatform platform;
   LogStartsV1 header;
-  std::ostringstream out, err;
+  test::ConsoleCapture console{0};
+  std::ostringstream &out = console.out, &err = console.err;
 };
 
 TEST_F(StoreWatchTest, ProgressShowsAfterASecondAndErasesItself) {

@@ -86,36 +86,5 @@ TEST(FuzzCorpus, EachTypeSeedReadsAsAHeaderAndRecordsOfItsType) {
   EXPECT_GE(seeds, 19);  // every type with a class but the two headers
 }
 
-TEST(FuzzCorpus, DamagedSeedsAreReadAsTheReaderPromises) {
-  {
-    Read cut("cut-body");  // a body cut short: the boot keeps its header only
-    ASSERT_EQ(cut.result.boots.size(), 1u);
-    ASSERT_EQ(cut.onlyBoot().size(), 1u);
-    EXPECT_EQ(cut.log.systemLogLines, 3u);
-  }
-  {
-    Read version0("version0-after-data");  // dropped whole
-    EXPECT_TRUE(version0.result.boots.empty());
-  }
-  {
-    Read twoBoots("second-header-other-boot");  // kept under the first boot
-    ASSERT_EQ(twoBoots.result.boots.size(), 1u);
-    EXPECT_EQ(twoBoots.onlyBoot().size(), 4u);
-  }
-  {
-    Read noClass("no-class-types");  // skipped, reported once
-    ASSERT_EQ(noClass.result.boots.size(), 1u);
-    EXPECT_EQ(noClass.onlyBoot().size(), 2u);
-    EXPECT_EQ(noClass.log.systemLogLines, 1u);
-  }
-  {
-    Read above("above-the-table");  // keys above the table reuse the class before
-    ASSERT_EQ(above.result.boots.size(), 1u);
-    const RecordList& records = above.onlyBoot();
-    ASSERT_EQ(records.size(), 4u);
-    for (std::size_t i = 1; i < records.size(); ++i) EXPECT_EQ(records[i].recordClass(), RecordClass::SleepWake);
-  }
-}
-
 }  // namespace
 }  // namespace bw

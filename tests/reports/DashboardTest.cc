@@ -105,6 +105,30 @@ class Dashboard : public ::testing::Test {
 test::TempDir* Dashboard::laptop = nullptr;
 test::TempDir* Dashboard::desktop = nullptr;
 
+// The I/O figures of the laptop store at a rate of `rate` KB/s.
+std::string io(const std::string& rate) {
+  return "          Disk Reads:\t         0\n         Disk Writes:\t         0\n"
+         "          Bytes Read:\t    2048.0 MB (     " +
+         rate +
+         " KB/s)\n"
+         "       Bytes Written:\t       0.0 KB (       0.0 KB/s)\n\n"
+         "        Packets Sent:\t         0\n    Packets Received:\t         0\n"
+         "          Bytes Sent:\t       0.0 KB (       0.0 KB/s)\n"
+         "      Bytes Received:\t       0.0 KB (       0.0 KB/s)\n";
+}
+
+// Boot A's hour, as the battery ranking and the CPU ranking both print it.
+const std::string kBootAHour = R"(                Time:	2024-01-01 00:00:01 to 2024-01-01 01:00:01 (01:00:00)
+               Power:	-6000 mW (-10.0 %/hr)
+      Avg. Frequency:	2.000 GHz
+         C-State Res:	90.0%
+    Process Intrpts.:	3690
+            CPU Time:	00:00:54 (1.5%)
+                  	00:00:36 (1.0%)  	3600	App
+                  	00:00:18 (0.5%)  	90	helper
+                  	00:00:00 (0.0%)  	0	Tool
+)";
+
 // Derived by hand from the store above. Total: positions 0 to 9,000,000 =
 // 02:30:00. Wake: A's hour and B's half hour; active: A until 1,800,000 and
 // all of B; on battery: A. Battery lines: 500 mAh of 5000 in one hour is
@@ -116,11 +140,11 @@ test::TempDir* Dashboard::desktop = nullptr;
 // A's own hour. Processes: 36 + 18 + 90 s = 00:02:24, 2.7 % of 5400 s;
 // 3600 + 90 + 900 interrupts; helper and the two Tools started inside the
 // ranges, App before; a job's resident size is its largest process's
-// (Tool: 1 GiB, printed in MB); 1 MiB is not above 1 MiB and prints in KB. Battery use ranks A's hour
-// alone (B charges); CPU activity ranks lowest residency first, B then A;
+// (Tool: 1 GiB, printed in MB); 1 MiB is not above 1 MiB and prints in KB.
+// Battery use ranks A's hour alone (B charges); CPU activity ranks lowest residency first, B then A;
 // within a range jobs of equal CPU time go by label. Wi-Fi: A's hour, 40 %
 // of the total.
-const char* const kLaptopDashboard = R"(
+const std::string kLaptopDashboard = R"(
 Summary
 =======
       System Version:	20A1
@@ -162,29 +186,13 @@ CPU Summary
 
 I/O Summary
 ===========
-          Disk Reads:	         0
-         Disk Writes:	         0
-          Bytes Read:	    2048.0 MB (     388.4 KB/s)
-       Bytes Written:	       0.0 KB (       0.0 KB/s)
-
-        Packets Sent:	         0
-    Packets Received:	         0
-          Bytes Sent:	       0.0 KB (       0.0 KB/s)
-      Bytes Received:	       0.0 KB (       0.0 KB/s)
-
+)" + io("388.4") +
+                                     R"(
 Top I/O Activity
 ================
                 Time:	2024-01-01 00:00:01 to 2024-01-01 01:00:01 (01:00:00)
-          Disk Reads:	         0
-         Disk Writes:	         0
-          Bytes Read:	    2048.0 MB (     582.5 KB/s)
-       Bytes Written:	       0.0 KB (       0.0 KB/s)
-
-        Packets Sent:	         0
-    Packets Received:	         0
-          Bytes Sent:	       0.0 KB (       0.0 KB/s)
-      Bytes Received:	       0.0 KB (       0.0 KB/s)
-
+)" + io("582.5") +
+                                     R"(
 
 Processes
 =========
@@ -216,16 +224,8 @@ Top Resident Size:
 
 Top Battery Usage
 =================
-                Time:	2024-01-01 00:00:01 to 2024-01-01 01:00:01 (01:00:00)
-               Power:	-6000 mW (-10.0 %/hr)
-      Avg. Frequency:	2.000 GHz
-         C-State Res:	90.0%
-    Process Intrpts.:	3690
-            CPU Time:	00:00:54 (1.5%)
-                  	00:00:36 (1.0%)  	3600	App
-                  	00:00:18 (0.5%)  	90	helper
-                  	00:00:00 (0.0%)  	0	Tool
-
+)" + kBootAHour +
+                                     R"(
 
 Top CPU Activity
 ================
@@ -238,16 +238,8 @@ Top CPU Activity
                   	00:00:00 (0.0%)  	0	App
                   	00:00:00 (0.0%)  	0	helper
 
-                Time:	2024-01-01 00:00:01 to 2024-01-01 01:00:01 (01:00:00)
-               Power:	-6000 mW (-10.0 %/hr)
-      Avg. Frequency:	2.000 GHz
-         C-State Res:	90.0%
-    Process Intrpts.:	3690
-            CPU Time:	00:00:54 (1.5%)
-                  	00:00:36 (1.0%)  	3600	App
-                  	00:00:18 (0.5%)  	90	helper
-                  	00:00:00 (0.0%)  	0	Tool
-
+)" + kBootAHour +
+                                     R"(
 
 Connected Devices
 =================

@@ -140,21 +140,21 @@ TEST_F(Telemetry, ADayWithBatteryACSleepAndDarkWakeSendsTheSixMessagesThenStandb
 
   const TelemetryMessage& battery = messages[0];
   // On battery and awake from 00:00:01 to 03:00: 400 mAh given.
-  EXPECT_EQ(battery.value(kKey + "battery-wake.delta_charge"), "400");
-  EXPECT_EQ(battery.value(kKey + "battery-wake.delta_charge.duration"), "10799");
-  EXPECT_TRUE(battery.value(kKey + "battery-wake.avg_power"));
-  EXPECT_EQ(battery.value(kKey + "battery-idle.delta_charge.duration"), "3600");
-  EXPECT_TRUE(battery.value(kKey + "ac-wake.delta_charge.duration"));
-  EXPECT_TRUE(battery.value(kKey + "ac-sleep.delta_charge.duration"));
-  EXPECT_TRUE(battery.value(kKey + "ac-darkwake.delta_charge.duration"));
-  EXPECT_EQ(battery.value(kKey + "battery.cycle_count"), "42");
-  EXPECT_EQ(battery.value(kKey + "battery.max_capacity"), "4500");
-  EXPECT_EQ(battery.value(kKey + "battery.design_capacity"), "5000");
-  EXPECT_EQ(battery.value(kKey + "battery.health"), "Good");
-  EXPECT_EQ(battery.value(kKey + "battery-wake.display_brightness"), "50");
-  EXPECT_EQ(battery.value(kKey + "device.wi-fi"), "yes");
-  EXPECT_EQ(battery.value(kKey + "device.audio"), "yes");
-  EXPECT_EQ(battery.value(kKey + "ac-sleep.device.wi-fi"), "yes");
+  const std::pair<const char*, const char*> fields[] = {{"battery-wake.delta_charge", "400"},
+                                                        {"battery-wake.delta_charge.duration", "10799"},
+                                                        {"battery-idle.delta_charge.duration", "3600"},
+                                                        {"battery.cycle_count", "42"},
+                                                        {"battery.max_capacity", "4500"},
+                                                        {"battery.design_capacity", "5000"},
+                                                        {"battery.health", "Good"},
+                                                        {"battery-wake.display_brightness", "50"},
+                                                        {"device.wi-fi", "yes"},
+                                                        {"device.audio", "yes"},
+                                                        {"ac-sleep.device.wi-fi", "yes"}};
+  for (auto [key, value] : fields) EXPECT_EQ(battery.value(kKey + key), value) << key;
+  for (const char* key : {"battery-wake.avg_power", "ac-wake.delta_charge.duration", "ac-sleep.delta_charge.duration",
+                          "ac-darkwake.delta_charge.duration"})
+    EXPECT_TRUE(battery.value(kKey + key)) << key;
 
   const TelemetryMessage& psr = messages[4];
   EXPECT_EQ(psr.value(kKey + "psr"), "25");
@@ -186,9 +186,9 @@ TEST_F(Telemetry, ADesktopStillSendsTheACAndWakeGroups) {
   ASSERT_FALSE(messages.empty());
   const TelemetryMessage& battery = messages[0];
   EXPECT_EQ(battery.domain(), "com.vexil.telemetry.battery.daily");
-  EXPECT_TRUE(battery.value(kKey + "ac-wake.delta_charge.duration"));
-  EXPECT_TRUE(battery.value(kKey + "wake-active.delta_charge.duration"));
-  EXPECT_TRUE(battery.value(kKey + "wake-idle.delta_charge.duration"));
+  for (const char* key :
+       {"ac-wake.delta_charge.duration", "wake-active.delta_charge.duration", "wake-idle.delta_charge.duration"})
+    EXPECT_TRUE(battery.value(kKey + key)) << key;
   for (const auto& [key, value] : battery.fields())
     EXPECT_EQ(key.rfind(kKey + "battery-", 0), std::string::npos) << key;
 }

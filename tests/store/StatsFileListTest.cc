@@ -7,8 +7,10 @@
 #include "base/Exception.h"
 #include "store/Cleanup.h"
 #include "store/StatsFileList.h"
+#include "support/ConsoleCapture.h"
 #include "support/FakePlatform.h"
 #include "support/TempDir.h"
+#include "support/Thrown.h"
 #include "time/Calendar.h"
 
 namespace bw {
@@ -66,13 +68,9 @@ TEST(StatsFileList, MissingLocalDirectoriesGiveAnEmptyList) {
 TEST(StatsFileList, DebugLinesNameEachScannedDirectory) {
   test::TempDir dir;
   dir.write("a.stats");
-  std::ostringstream o, e;
-  setConsole(&o, &e);
-  gDebug = 1;
+  test::ConsoleCapture console;
   statsFileList(fromQuery(dir.path(), Date{0}));
-  gDebug = 0;
-  setConsole(nullptr, nullptr);
-  EXPECT_EQ(e.str(),
+  EXPECT_EQ(console.err.str(),
             "Adding files from " + dir.path() + " recursively (periodic files newer than 1970-01-01 00:00:00 +0000)\n");
 }
 
@@ -124,13 +122,9 @@ TEST_F(Cleanup, SafeRemovalRefusesPathsOutsideTheManagedAreas) {
   std::string outside = stale("elsewhere/old.stats", 1000);
   std::string wrongSuffix = stale("var/db/brindlewick/keep.txt", 1000);
   for (const std::string& path : {outside, wrongSuffix, root / "var/db/brindlewick"}) {
-    try {
-      safelyRemove(path);
-      ADD_FAILURE() << "no exception for " << path;
-    } catch (const Exception& e) {
-      EXPECT_EQ(e.name(), kInvalidArgumentException);
-      EXPECT_EQ(e.reason(), "Attempted to delete a file that is not in a Brindlewick-managed area of the filesystem.");
-    }
+    SCOPED_TRACE(path);
+    test::thrown([&] { safelyRemove(path); }, kInvalidArgumentException,
+                 "Attempted to delete a file that is not in a Brindlewick-managed area of the filesystem.");
   }
   EXPECT_TRUE(std::filesystem::exists(outside));
   EXPECT_TRUE(std::filesystem::exists(wrongSuffix));
