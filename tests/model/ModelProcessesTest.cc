@@ -25,35 +25,9 @@ class ModelProcesses : public ::testing::Test {
       records.push_back(std::make_unique<ProcessUsage>(test::processUsage(s)));
     return records;
   }
-  double cpuMs(const ProcessSummary& root, const char* job) { return root.subprocesses().at(job)->cpuTime() / 1e6; }
-
   test::ResourceModel built{records()};
   Model* model = &built.model();
 };
-
-TEST_F(ModelProcesses, TheThreeOperationsSummarizeJobsOverRelativeAndAbsoluteRanges) {
-  ASSERT_NE(model->processes(), nullptr);
-  EXPECT_EQ(model->processes(), model->summarizer("Processes"));
-
-  const std::vector<Range> whole{{0, 3001}};
-  auto plain = model->summarizeProcessesIncludingSubjobs(false, whole);
-  EXPECT_EQ(plain->cpuTime(), 35e6);
-  EXPECT_EQ(cpuMs(*plain, "App"), 30);
-  auto with = model->summarizeProcessesIncludingSubjobs(true, whole);
-  EXPECT_EQ(cpuMs(*with, "App"), 35);
-  EXPECT_EQ(with->cpuTime(), 35e6);
-
-  ProcessSummary relative;
-  model->summarizeProcesses(relative, true, Range{1000, 1000});
-  EXPECT_EQ(cpuMs(relative, "App"), 15);  // 10 of its own, the tool's 5
-  EXPECT_EQ(relative.spawns(), 1);        // the tool
-
-  ProcessSummary absolute;
-  model->summarizeProcesses(absolute, false, AbsRange::rangeWithBoot(test::bootNamed(7), 0, 1000));
-  EXPECT_EQ(cpuMs(absolute, "App"), 10);
-  EXPECT_EQ(cpuMs(absolute, "tool"), 0);
-  EXPECT_EQ(absolute.stillrunning(), 1u);
-}
 
 TEST_F(ModelProcesses, UsageCountsEveryProcessOnceUnderTheJobThatRunsIt) {
   const std::optional<ProcessFigures> usage = ModelUsageInputs(*model).processUsage({{0, 3001}});

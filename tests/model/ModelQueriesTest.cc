@@ -81,11 +81,5 @@ TEST_F(ModelQueries, TopSummariesComeGreatestFirstWithoutEmptyOverlaps) {
   EXPECT_EQ(filtered[0]->duration(), 5u);
 }
 
-TEST_F(ModelQueries, ReadingAKeyOfASummaryStoresAnEmptyList) {
-  Summary s;
-  EXPECT_TRUE(s["wakes"].empty());
-  EXPECT_EQ(s.storage().count("wakes"), 1u);
-}
-
 }  // namespace
 }  // namespace bw
