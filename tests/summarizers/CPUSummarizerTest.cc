@@ -115,11 +115,6 @@ TEST(CPUSummary, QoSNeedsBothSlopesAndIsClampedAboveOnly) {
     EXPECT_EQ(c.qosIdleTime(), k.idleTime);
     EXPECT_EQ(c.qosDenom(), k.denom);
   }
-  // A negative slope cannot come from counters that only grow between
-  // resets; the clamp itself keeps it.
-  EXPECT_EQ(CPUSummarizer::qosTimeInRange(2.0, 1000), 1000);
-  EXPECT_EQ(CPUSummarizer::qosTimeInRange(0.25, 1000), 250);
-  EXPECT_EQ(CPUSummarizer::qosTimeInRange(-0.5, 1000), -500);
   CPUSummary q;
   q.setQosBgTime(30), q.setQosIdleTime(40), q.setQosDenom(100);
   EXPECT_DOUBLE_EQ(backgroundQoSRatioPercent(q), 50);
@@ -171,18 +166,6 @@ TEST(CPUSummary, BadCountersLeaveTheirQuantityOut) {
   ASSERT_EQ(once.avgCStateResidencyBreakdown()->count(7), 1u);
   EXPECT_NEAR(once.avgCStateResidencyBreakdown()->at(7), 8000, 1e-9);                 // 12000 - 4000 at the range start
   EXPECT_EQ(summarize(fresh, kMinute, 3 * kMinute, 9).avgCStateResidencyDenom(), 0);  // a boot never seen
-}
-
-TEST(CPUSummary, ComparatorRanksByResidencyDescendingWithinTheEpsilon) {
-  auto withResidency = [](double numer, double denom) {
-    CPUSummary c;
-    c.setAvgCStateResidencyNumer(numer), c.setAvgCStateResidencyDenom(denom);
-    return c;
-  };
-  const CPUSummary low = withResidency(30, 100), high = withResidency(0.9, 1);
-  EXPECT_GT(CPUSummarizer::compareResidency(low, high), 0);
-  EXPECT_LT(CPUSummarizer::compareResidency(high, low), 0);
-  EXPECT_EQ(CPUSummarizer::compareResidency(withResidency(0.3, 1), withResidency(0.1 + 0.2, 1)), 0);
 }
 
 }  // namespace

@@ -204,39 +204,14 @@ class JobSummaries : public ProcessAccounting {
     feed(s, daemon);
     s.setLastPosition(1500);
   }
-  std::unique_ptr<ProcessSummary> summarize(bool includingSubjobs, std::vector<AbsRange> ranges = {whole()}) {
-    return s.summarizeJobs(includingSubjobs, ranges);
-  }
-  static AbsRange whole() { return AbsRange::rangeWithBoot(boot(1), 0, 2000); }
-  static double sum(const ProcessSummary& root, double (ProcessSummary::*figure)() const) {
-    double total = 0;
-    for (const auto& [key, job] : root.subprocesses()) total += ((*job).*figure)();
-    return total;
+  std::unique_ptr<ProcessSummary> summarize(std::vector<AbsRange> ranges = {AbsRange::rangeWithBoot(boot(1), 0, 2000)}) {
+    return s.summarizeJobs(false, ranges);
   }
   ProcessSummarizer s;
 };
 
-TEST_F(JobSummaries, JobLinesAddUpToTheTotalsWithoutSubjobsAndExceedThemByOwnedUsageWith) {
-  auto plain = summarize(false);
-  EXPECT_EQ(plain->subprocesses().size(), 3u);
-  EXPECT_EQ(plain->cpuTime(), 150 * kMs);
-  EXPECT_EQ(plain->idleWakeups(), 17);
-  EXPECT_EQ(plain->interrupts(), 31);
-  for (auto figure : {&ProcessSummary::cpuTime, &ProcessSummary::idleWakeups, &ProcessSummary::interrupts})
-    EXPECT_EQ(sum(*plain, figure), ((*plain).*figure)());
-
-  auto with = summarize(true);
-  EXPECT_EQ(with->cpuTime(), 150 * kMs);
-  const ProcessSummary& app = *with->subprocesses().at("App");
-  EXPECT_EQ(app.cpuTime(), 140 * kMs);
-  EXPECT_EQ(app.idleWakeups(), 16);
-  EXPECT_EQ(app.interrupts(), 28);
-  EXPECT_EQ(sum(*with, &ProcessSummary::cpuTime), 190 * kMs);
-  EXPECT_EQ(with->subprocesses().at("Daemon")->cpuTime(), 10 * kMs);
-}
-
 TEST_F(JobSummaries, SpawnsRuntimeSizesAndStillRunningPerJob) {
-  auto root = summarize(false);
+  auto root = summarize();
   const ProcessSummary& app = *root->subprocesses().at("App");
   EXPECT_EQ(app.spawns(), 1);
   EXPECT_EQ(app.runtime(), 900);
@@ -251,11 +226,10 @@ TEST_F(JobSummaries, SpawnsRuntimeSizesAndStillRunningPerJob) {
   EXPECT_EQ(root->maxResidentSize(), 8192);
 
   // Split ranges add up; a later range sees no new spawn.
-  auto split =
-      summarize(false, {AbsRange::rangeWithBoot(boot(1), 0, 600), AbsRange::rangeWithBoot(boot(1), 600, 2000)});
+  auto split = summarize({AbsRange::rangeWithBoot(boot(1), 0, 600), AbsRange::rangeWithBoot(boot(1), 600, 2000)});
   EXPECT_DOUBLE_EQ(split->cpuTime(), root->cpuTime());
   EXPECT_EQ(split->spawns(), 3);
-  auto late = summarize(false, {AbsRange::rangeWithBoot(boot(1), 1200, 1500)});
+  auto late = summarize({AbsRange::rangeWithBoot(boot(1), 1200, 1500)});
   EXPECT_EQ(late->spawns(), 0);
   EXPECT_EQ(late->subprocesses().at("App")->runtime(), 0);
 }
@@ -279,37 +253,6 @@ TEST_F(ProcessAccounting, ANegativeSpawnCountLeavesItsJobOutAndEachProblemIsLogg
             (std::vector<std::string>{ProcessSummarizer::kNegativeRangeMessage, ProcessSummarizer::kExceptionMessage}));
   // Over sound ranges the job is back.
   EXPECT_EQ(s.summarizeJobs(false, {AbsRange::rangeWithBoot(boot(1), 0, 1000)})->subprocesses().count("Flat"), 1u);
-}
-
-TEST(ProcessSummary, SubprocessesSortLargestFirstByEachComparison) {
-  ProcessSummary root;
-  auto add = [&](const char* key, double cpu, double idle, double interrupts) {
-    auto s = std::make_unique<ProcessSummary>();
-    s->setCpuTime(cpu), s->setIdleWakeups(idle), s->setInterrupts(interrupts);
-    root.subprocesses()[key] = std::move(s);
-  };
-  add("busy", 3e6, 0, 30);
-  add("waker", 1e6, 10, 5);
-  add("idle", 0, 1, 100);
-  auto order = [&](ProcessSummary::Comparison c) {
-    std::string keys;
-    for (const ProcessSummary* s : root.subprocessesSortedBySelector(c))
-      keys += std::to_string(static_cast<long long>(s->cpuTime())) + " ";
-    return keys;
-  };
-  EXPECT_EQ(root.subprocesses().at("waker")->powerScore(), 6e6);
-  EXPECT_EQ(order(&ProcessSummary::comparePowerScores), "1000000 3000000 0 ");
-  EXPECT_EQ(order(&ProcessSummary::compareCPUTime), "3000000 1000000 0 ");
-  EXPECT_EQ(order(&ProcessSummary::compareInterrupts), "0 3000000 1000000 ");
-  // No CPU time counts as no interrupts per CPU second.
-  EXPECT_EQ(order(&ProcessSummary::compareInterruptsPerCPUSecond), "3000000 1000000 0 ");
-
-  ProcessSummary a, b;
-  a.setRuntime(1e-17);
-  EXPECT_EQ(a.compareRuntimes(b), 0);
-  a.setRuntime(1e-15);
-  EXPECT_GT(a.compareRuntimes(b), 0);
-  EXPECT_LT(b.compareRuntimes(a), 0);
 }
 
 TEST(JobGraph, RowsMarkColumnsAboveEachThreshold) {
