@@ -6,7 +6,6 @@
 #include "domains/AbsoluteDomain.h"
 #include "domains/AllDomain.h"
 #include "domains/BootDomain.h"
-#include "domains/DateDomain.h"
 #include "domains/PostInstallDomain.h"
 #include "domains/RelativeTimeDomain.h"
 #include "domains/WallTimeDomain.h"
@@ -19,14 +18,6 @@ using test::feed;
 using test::idle;
 using test::wakeAt;
 using Ranges = std::vector<Range>;
-
-TEST(AllDomain, SelectsFromZeroToTheLastPositionWhateverTheRecords) {
-  AllDomain domain;
-  feed(domain, idle(), 100);
-  feed(domain, idle(), 500);
-  domain.setLastPosition(500);
-  EXPECT_EQ(domain.ranges(), (Ranges{{0, 500}}));
-}
 
 TEST(RelativeTimeDomain, IncludesRecordsOnBothBounds) {
   RelativeTimeDomain domain(100, 200);
@@ -121,28 +112,20 @@ TEST(PostInstallDomain, EndsAtTheNextBootAndTreatsAMissingPreviousVersionAsAnUpd
   EXPECT_EQ(domain.ranges(), (Ranges{{100, 3'600'000}}));
 }
 
-TEST(Domain, TheChoiceNamesTheDomainAndItsBounds) {
-  DomainChoice choice;
-  EXPECT_NE(dynamic_cast<AllDomain*>(Domain::domainWithChoice(choice).get()), nullptr);
-
-  choice.type = kDomainDate;
-  choice.day = YearMonthDay{2024, 2, 29};
-  auto date = Domain::domainWithChoice(choice);
-  auto* day = dynamic_cast<DateDomain*>(date.get());
-  ASSERT_NE(day, nullptr);
-  EXPECT_EQ(day->components(), (YearMonthDay{2024, 2, 29}));
-
-  choice.start = 100;
-  choice.end = 200;
-  for (std::uint32_t type : {kDomainWallTime, kDomainRelative}) {
-    choice.type = type;
-    auto domain = Domain::domainWithChoice(choice);
-    auto* relative = dynamic_cast<RelativeTimeDomain*>(domain.get());
-    ASSERT_NE(relative, nullptr);
-    EXPECT_EQ(dynamic_cast<WallTimeDomain*>(relative) != nullptr, type == kDomainWallTime);
-    EXPECT_EQ(relative->start(), 100u);
-    EXPECT_EQ(relative->end(), 200u);
-  }
+// The run's own tests see the relative and date selections; the wall-time
+// and absolute ones, and the silent domains, are checked here.
+TEST(DomainAnnouncements, WithDebugEachConstructorPrintsItsSelection) {
+  ASSERT_TRUE(test::kProcessZoneSet);
+  test::ConsoleCapture capture;
+  WallTimeDomain wall(1'705'273'200'000, 1'705'359'600'999);
+  AbsoluteDomain absolute(AbsRange::rangeWithBoot(test::bootNamed(0xAB), 1'000, 3'000));
+  AllDomain all;
+  BootDomain boot(std::nullopt);
+  PostInstallDomain postInstall;
+  EXPECT_EQ(capture.err.str(),
+            "Selecting events from 2024-01-15 00:00:00 +0100 (1705273200) to 2024-01-16 00:00:00 +0100 "
+            "(1705359600)\n"
+            "Selecting events from 1000 to 3000 in ABABABAB-ABAB-ABAB-ABAB-ABABABABABAB\n");
 }
 
 }  // namespace
