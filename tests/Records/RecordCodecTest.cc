@@ -8,8 +8,6 @@
 #include <new>
 
 #include "RecordTestSupport.h"
-#include "Records/PackageEnergyStatistics.h"
-#include "Records/SystemIO.h"
 #include "base/Exception.h"
 #include "support/Thrown.h"
 
@@ -81,14 +79,6 @@ TEST(RecordCodec, WireFormsAreWrittenAndReadAsExpected) {
   const std::string element = W().varint(1, 3).groupEnd(7).varint(2, 99).str();
   const std::string key = W().bytes(1, "TB0T").str();
   const WireCase cases[] = {
-      {"negative sint64 uses zigzag",
-       C::BatteryChargeLevel,
-       {{"charge", -5}, {"maxCharge", 5000}, {"cycleCount", 0}, {"instantAmperage", -1500}},
-       std::string("\x10\x09\x18\x90\x4e\x20\x00\x28\xb7\x17", 10)},
-      {"negative int32 is a ten-byte varint",
-       C::FanState,
-       {{"absolute_time", 1}, {"loudness", -2}},
-       "\x08\x01\x10\xfe\xff\xff\xff\xff\xff\xff\xff\xff\x01"},
       {"required scalars are written unset", C::UserIdle, {}, std::string("\x08\x00\x10\x00", 4)},
       {"an absent optional field is not", C::BatteryChargeLevel, {}, std::string("\x10\x00\x18\x00\x20\x00", 6)},
       {"a present optional zero is",
@@ -96,11 +86,6 @@ TEST(RecordCodec, WireFormsAreWrittenAndReadAsExpected) {
        {{"absoluteTime", 3}, {"diskReadOps", 0}},
        W().varint(1, 3).varint(2, 0).str()},
       {"Interrupts without vectors writes only field 1", C::Interrupts, {{"absoluteTime", 1234}}, "\x08\xd2\x09"},
-      {"repeated elements are length-delimited in order",
-       C::Interrupts,
-       {{"absoluteTime", 1},
-        {"vectors", Array{Dictionary{{"cpuNumber", 0}, {"interruptCount", 10}}, Dictionary{{"vectorName", "hpet"}}}}},
-       W().varint(1, 1).bytes(64, W().varint(1, 0).varint(2, 10).str()).bytes(64, W().bytes(3, "hpet").str()).str()},
       {"DisplayBrightness skips a field 2",
        C::DisplayBrightness,
        {{"absoluteTime", 77}, {"brightness", 40}},
@@ -220,22 +205,6 @@ TEST(RecordEquality, ComparesPresenceValuesAndElementsInOrder) {
   }
   const Dictionary same = {{"absoluteTime", 1}, {"wallTime", 2}, {"reason", 3}};
   EXPECT_FALSE(build(C::DateChange, same)->isEqual(*build(C::TimeChange, same)));
-}
-
-TEST(RecordEquality, AClearedFlagHidesTheValueEverywhere) {
-  SystemIO io, plain;
-  io.setAbsoluteTime(3);
-  plain.setAbsoluteTime(3);
-  io.setNetworkBytesOut(7);
-  io.setHasNetworkBytesOut(false);
-  EXPECT_TRUE(io.isEqual(plain));
-  EXPECT_EQ(io.hash(), plain.hash());
-  EXPECT_EQ(io.serialize(), plain.serialize());
-  EXPECT_EQ(io.dictionaryRepresentation(), plain.dictionaryRepresentation());
-  PackageEnergyStatistics energy;
-  energy.setPkgCanyResidency(987);
-  energy.setHasPkgCanyResidency(false);
-  EXPECT_EQ(energy.prettyPrint(), "PackageEnergyStatistics\t0");
 }
 
 struct CopyCase {

