@@ -87,7 +87,7 @@ auto randomBelow(unsigned seed) {
 }
 
 // Random events, mostly ascending, sometimes back in time; queries while
-// they arrive, after them, and after merging another ledger in.
+// they arrive and after them.
 TEST(ReferenceComparison, LedgerTimeAndValueMatchTheEventWalk) {
   auto below = randomBelow(7);
   auto check = [&](const Ledger& ledger, Range r, std::uint64_t p) {
@@ -100,7 +100,7 @@ TEST(ReferenceComparison, LedgerTimeAndValueMatchTheEventWalk) {
   auto list = [&] { return below(1) ? Ledger::List::Credits : Ledger::List::Debits; };
   for (int round = 0; round < 3000; ++round) {
     SCOPED_TRACE(round);
-    Ledger ledger, other;
+    Ledger ledger;
     std::uint64_t position = 0;
     for (int k = 0, events = static_cast<int>(below(16)); k < events; ++k) {
       position = below(5) == 0 ? below(position) : position + below(6);
@@ -109,10 +109,6 @@ TEST(ReferenceComparison, LedgerTimeAndValueMatchTheEventWalk) {
     }
     check(ledger, Range{below(80), UINT64_MAX - below(3)}, 0);  // the end wraps
     for (int q = 0; q < 20; ++q) check(ledger, Range{below(80), below(80)}, below(80));
-    for (int k = 0; k < 4; ++k) other.addTo(list(), below(40));
-    ledger.merge(other);
-    ledger.finalizeMerges();
-    for (int q = 0; q < 5; ++q) check(ledger, Range{below(50), below(50)}, below(50));
   }
 }
 

@@ -255,53 +255,5 @@ TEST_F(ProcessAccounting, ANegativeSpawnCountLeavesItsJobOutAndEachProblemIsLogg
   EXPECT_EQ(s.summarizeJobs(false, {AbsRange::rangeWithBoot(boot(1), 0, 1000)})->subprocesses().count("Flat"), 1u);
 }
 
-TEST(JobGraph, RowsMarkColumnsAboveEachThreshold) {
-  auto p = std::make_shared<Process>();
-  p->addSample(Process::kCpuTime, 0, 0);
-  p->addSample(Process::kCpuTime, 2.5e9, 500);           // 5 per column for the first half
-  p->addSample(Process::kCpuTime, 2.5e9 + 2.5e7, 1000);  // 0.05 per column after
-  Job job;
-  job.addProcess(p, boot(1));
-  const std::string graph = job.graphOverRange(AbsRange::rangeWithBoot(boot(1), 0, 1000));
-
-  const struct {
-    const char* label;
-    double threshold;
-  } rows[] = {{"100.00%   |", 1000}, {" 31.62%   |", 316.2},   {" 10.000%  |", 100},  {"  3.162%  |", 31.62},
-              {"  1.000%  |", 10},   {"   0.3162%|", 3.162},   {"   0.1000%|", 1},    {"   0.0316%|", 0.3162},
-              {"   0.0100%|", 0.1},  {"   0.0031%|", 0.03162}, {"   0.0010%|", 0.01}, {"   0.0003%|", 0.003162}};
-  std::string expected;
-  for (const auto& row : rows) {
-    expected += std::string(row.label) + " " + std::string(50, 5 > row.threshold ? '*' : ' ') +
-                std::string(50, 0.05 > row.threshold ? '*' : ' ') + "\n";
-  }
-  expected += " avg %cpu |" + std::string(101, '_') + "\n";
-  EXPECT_EQ(graph, expected);
-  // Short ranges step by one unit.
-  EXPECT_EQ(job.graphOverRange(AbsRange::rangeWithBoot(boot(1), 0, 5)).find('\n'), 11u + 6u);
-}
-
-TEST(JobMerge, AMergedJobAnswersForBothAndKeepsItsOwnNames) {
-  auto p = std::make_shared<Process>(), q = std::make_shared<Process>();
-  p->setStart_time({boot(1), 0}), q->setStart_time({boot(1), 50});
-  p->addSample(Process::kCpuTime, 0, 0), p->addSample(Process::kCpuTime, 1e6, 100);
-  q->addSample(Process::kCpuTime, 0, 50), q->addSample(Process::kCpuTime, 3e6, 100);
-  Job a, b;
-  a.addProcess(p, boot(1));
-  b.addProcess(q, boot(1));
-  b.setLabel(std::make_shared<const std::string>("B.42"));
-  b.setCpuTime(7), b.setElapsedTime(9);
-  b.aggregate()["extra"] = std::make_shared<AggregateInterpolator>();
-  a.mergeJob(b);
-  a.finalizeMerges();
-  const AbsRange range = AbsRange::rangeWithBoot(boot(1), 0, 200);
-  EXPECT_EQ(a.aggregateCPUTime().deltaAcrossAbsoluteRange(range), 4e6);
-  EXPECT_EQ(a.spawns().creditsAtAbsoluteTime(range.end()), 2u);
-  EXPECT_EQ(*a.label(), "B");
-  EXPECT_EQ(a.cpuTime(), 7u);
-  EXPECT_EQ(a.elapsedTime(), 9u);
-  EXPECT_NE(a.objectForKeyedSubscript("extra"), nullptr);
-}
-
 }  // namespace
 }  // namespace bw
