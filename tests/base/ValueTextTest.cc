@@ -3,7 +3,6 @@
 #include <climits>
 #include <cstdio>
 
-#include "base/Date.h"
 #include "base/DecimalText.h"
 #include "base/Duration.h"
 #include "base/Value.h"
@@ -50,12 +49,6 @@ TEST(ValueText, DataPrintsHexInGroupsOfFourBytes) {
   Data d{0x01, 0x02, 0x03, 0x04, 0xab, 0xcd};
   EXPECT_EQ(describeValue(Value(d)), "<01020304 abcd>");
   EXPECT_EQ(describeValue(Value(Data{})), "<>");
-}
-
-TEST(ValueText, DatesPrintInUtcAndTheDistantPastAsYearOne) {
-  EXPECT_EQ(describeDate(Date{0}), "1970-01-01 00:00:00 +0000");
-  EXPECT_EQ(describeDate(Date{1704164645.9}), "2024-01-02 03:04:05 +0000");
-  EXPECT_EQ(describeDate(Date::distantPast()), "0001-01-01 00:00:00 +0000");
 }
 
 // The hot text writers' integers print as printf prints them.

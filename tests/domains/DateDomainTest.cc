@@ -47,29 +47,6 @@ TEST(DateDomain, AZoneChangeFromPlusOneToPlusTwoMovesBothBoundsAnHourEarlier) {
             "Time zone change! Now zone is Africa/Harare. Adjusting start/end to 1705269600000-1705356000000\n");
 }
 
-TEST(DateDomain, SelectsNothingBeforeTheFirstTimeChange) {
-  DateDomain domain({2024, 1, 15});
-  feedAt(domain, idle(), kLagosStart + 1'000);
-  feedAt(domain, idle(), kLagosStart + 2'000);
-  domain.setLastPosition(kLagosStart + 2'000 - kBase);
-  EXPECT_TRUE(domain.ranges().empty());
-  EXPECT_FALSE(domain.tzSet());
-  EXPECT_EQ(domain.lastTime(), 0u);
-}
-
-TEST(DateDomain, UnknownAbbreviationAtOffsetZeroKeepsEmptyBounds) {
-  ConsoleCapture capture;
-  DateDomain domain({2024, 1, 15});
-  feedAt(domain, zoneChange("XYZ", 0), kLagosStart + 1'000);
-  feedAt(domain, idle(), kLagosStart + 2'000);
-  domain.setLastPosition(kLagosStart + 2'000 - kBase);
-  EXPECT_TRUE(domain.tzSet());
-  EXPECT_EQ(domain.start(), 0u);
-  EXPECT_EQ(domain.end(), 0u);
-  EXPECT_TRUE(domain.ranges().empty());
-  EXPECT_EQ(capture.err.str(), "Selecting events from 2024-01-15\n");
-}
-
 TEST(DateDomain, UnknownAbbreviationTakesTheDayFromTheOffsetAcrossAMonthEnd) {
   ConsoleCapture capture;
   DateDomain domain({2024, 1, 31});

@@ -37,25 +37,6 @@ TEST(WallTimeDomain, DatesChangesBackToWhereTheClockCrossedTheBounds) {
   EXPECT_EQ(domain.lastTime(), 161'000u);
 }
 
-TEST(WallTimeDomain, RecordsWithoutTheirOwnWallTimeChangeAtTheirPositionAndEndIsIncluded) {
-  WallTimeDomain domain(1'030'000, 1'100'000);
-  feed(domain, idle(), 1'000, 1'000'000);
-  feed(domain, idle(), 61'000, 1'060'000);
-  feed(domain, idle(), 101'000, 1'100'000);  // exactly at end: still inside
-  feed(domain, idle(), 101'001, 1'100'001);
-  EXPECT_EQ(domain.ranges(), (Ranges{{61'000, 40'001}}));
-}
-
-TEST(WallTimeDomain, CrossingNoLaterThanThePreviousRecordChangesAtTheRecord) {
-  WallTimeDomain domain(1'030'000, 1'100'000);
-  // The first record of a walk counts from position 0: a crossing 30 s
-  // before a record at 10 s is not dated back.
-  feed(domain, wakeAt(0), 10'000, 1'060'000);
-  // A clock set back below start leaves at the record itself.
-  feed(domain, wakeAt(0), 20'000, 1'000'000);
-  EXPECT_EQ(domain.ranges(), (Ranges{{10'000, 10'000}}));
-}
-
 TEST(AbsoluteDomain, SelectsAHalfOpenRangeOfOneBoot) {
   const Uuid a = bootNamed(1), b = bootNamed(2);
   AbsoluteDomain domain(AbsRange::rangeWithBoot(a, 1'000, 2'000));
@@ -100,16 +81,6 @@ TEST(PostInstallDomain, CoversTheFirstHourAfterAnUpdateOnce) {
   EXPECT_EQ(domain.ranges(), (Ranges{{1'000, 3'600'001}}));
   ASSERT_TRUE(domain.startAbsTime().has_value());
   EXPECT_EQ(domain.startAbsTime()->time, 1'000u);
-}
-
-TEST(PostInstallDomain, EndsAtTheNextBootAndTreatsAMissingPreviousVersionAsAnUpdate) {
-  const Uuid a = bootNamed(1), b = bootNamed(2);
-  PostInstallDomain domain;
-  feed(domain, idle(), 0, 0, {a, 0});
-  feed(domain, logStart("21B7"), 100, 0, {a, 100});
-  feed(domain, idle(), 1'800'000, 0, {a, 1'800'000});
-  feed(domain, logStart("21B7"), 3'600'100, 0, {b, 0});
-  EXPECT_EQ(domain.ranges(), (Ranges{{100, 3'600'000}}));
 }
 
 // The run's own tests see the relative and date selections; the wall-time

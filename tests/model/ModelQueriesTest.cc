@@ -1,9 +1,7 @@
 #include <gtest/gtest.h>
 
-#include <functional>
 
 #include "model/Model.h"
-#include "support/Thrown.h"
 
 namespace bw {
 namespace {
@@ -38,29 +36,12 @@ class ModelQueries : public ::testing::Test {
   Model model;
 };
 
-TEST_F(ModelQueries, NoKeysAnswerTheGivenRangesUnchanged) {
-  EXPECT_FALSE(model.rangesForSubstates({}, std::nullopt));
-  EXPECT_EQ(model.rangesForSubstates({}, std::vector<Range>{{1, 2}}), (std::vector<Range>{{1, 2}}));
-}
-
 TEST_F(ModelQueries, KeysIntersectTheirStatesWithinTheGivenRanges) {
   EXPECT_EQ(model.rangesForSubstates({"Even"}, std::nullopt), (std::vector<Range>{{0, 10}, {20, 10}, {40, 10}}));
   EXPECT_EQ(model.rangesForSubstates({"Even", "Wide"}, std::nullopt), (std::vector<Range>{{5, 5}, {20, 10}}));
   EXPECT_EQ(model.rangesForSubstates({"Even", "Wide"}, std::vector<Range>{{8, 14}}),
             (std::vector<Range>{{8, 2}, {20, 2}}));
   EXPECT_EQ(model.rangesForSubstates({"Even", "Late"}, std::nullopt), std::vector<Range>{});
-}
-
-TEST_F(ModelQueries, AnUnknownKeyIsAnInvalidArgumentForEveryQuery) {
-  const auto refused = [](const std::function<void()>& query) {
-    if (auto e = test::thrown(query, kInvalidArgumentException, "no such summarizer: Nope")) {
-      EXPECT_TRUE(e->userInfo().empty());
-    }
-  };
-  refused([&] { model.rangesForSubstates({"Even", "Nope"}, std::nullopt); });
-  refused([&] { model.summarize("Nope", Range{0, 1}); });
-  refused([&] { model.summarize("Nope", std::vector<Range>{{0, 1}}); });
-  refused([&] { model.summarizeTop("Nope", {{0, 1}}, [](const Summary&) { return true; }); });
 }
 
 TEST_F(ModelQueries, SummarizeAccumulatesOverRangesAndEndsAtTheLast) {

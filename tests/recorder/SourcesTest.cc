@@ -10,7 +10,6 @@
 #include "Records/DisplayBrightness.h"
 #include "Records/FanState.h"
 #include "Records/Interrupts.h"
-#include "Records/LogStartsV1.h"
 #include "Records/PackageEnergyStatistics.h"
 #include "Records/PowerStateChange.h"
 #include "Records/ProcessUsage.h"
@@ -226,15 +225,6 @@ TEST(RecorderSources, CountersOfWholeDisksNetworksInterruptsAndMemory) {
   EXPECT_EQ(memory[0]->faults(), 123456u);
   EXPECT_TRUE(memory[0]->hasSwapDeviceIsSsd());
   EXPECT_TRUE(memory[0]->swapDeviceIsSsd());
-}
-
-TEST(RecorderSources, AbsentSourcesWriteNothing) {
-  Rig rig;
-  rig.recorder.begin();
-  rig.recorder.tick();
-  const auto store = rig.contents();
-  ASSERT_EQ(store.records.size(), 2u);  // the header and its TimeChange
-  EXPECT_NE(recordCast<LogStartsV1>(store.records[0]), nullptr);
 }
 
 }  // namespace

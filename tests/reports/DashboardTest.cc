@@ -1,6 +1,6 @@
 // The dashboard of the real binary over small stores written here, compared
-// as whole texts or by the lines a case is about; and the shared text
-// helpers on their edges.
+// as whole texts or by the lines a case is about; and the byte sizes the
+// stores do not reach.
 #include <gtest/gtest.h>
 
 #include <sstream>
@@ -8,11 +8,7 @@
 #include "Records/DeviceChange.h"
 #include "Records/PackageEnergyStatistics.h"
 #include "Records/SystemIO.h"
-#include "cli/ModelLoader.h"
-#include "cli/Options.h"
 #include "cli/RecordModesStore.h"
-#include "model/Model.h"
-#include "reports/Dashboard.h"
 #include "reports/ReportText.h"
 #include "summarizers/ProcessRecords.h"
 #include "support/RunTool.h"
@@ -301,46 +297,13 @@ TEST_F(Dashboard, IncludingSubjobsChangesTheOwnersLineButNotTheTotals) {
   }
 }
 
-TEST_F(Dashboard, RangeWithoutAbsoluteTimeLeavesTheIOSectionOut) {
-  // Between the boots no piece of absolute time exists, so the I/O
-  // summary's duration is 0. No domain selects such a range; the dashboard
-  // is handed one directly.
-  Options options;
-  options.setFrom_path(laptop->path());
-  std::vector<std::unique_ptr<Model>> models = loadModels(options);
-  ASSERT_EQ(models.size(), 1u);
-  models[0]->processEventsWithDomains({});
+TEST(ReportText, LongLabelsRunOnAndBytesChooseTheirUnit) {
   std::ostringstream o;
-  printDashboard(o, DashboardSettings{}, *models[0], {{4000000, 1000}});
-  EXPECT_TRUE(has(o.str(), "          Total Time:\t00:00:01"));
-  EXPECT_EQ(o.str().find("I/O"), std::string::npos);
-  EXPECT_TRUE(has(o.str(), "Top CPU Activity"));
-
-  std::ostringstream whole;
-  printDashboard(whole, DashboardSettings{}, *models[0], {{0, 9000000}});
-  EXPECT_TRUE(has(whole.str(), "I/O Summary"));
-}
-
-TEST(ReportText, LabelsAlignRightIn20ColumnsAndBytesChooseTheirUnit) {
-  struct Case {
-    std::size_t labelLength;
-    std::string line;
-  };
-  for (const Case& c : std::vector<Case>{{19, " " + std::string(19, 'x') + ":\tv\n"},
-                                         {20, std::string(20, 'x') + ":\tv\n"},
-                                         {21, std::string(21, 'x') + ":\tv\n"}}) {
-    std::ostringstream o;
-    printLabelLine(o, std::string(c.labelLength, 'x'), "v");
-    EXPECT_EQ(o.str(), c.line) << c.labelLength;
-  }
-  EXPECT_EQ(byteText(2.0 * kGiB), "    2048.0 MB");
-  EXPECT_EQ(byteText(1048576), "    1024.0 KB");
+  printLabelLine(o, std::string(21, 'x'), "v");
+  EXPECT_EQ(o.str(), std::string(21, 'x') + ":\tv\n");
   EXPECT_EQ(byteText(1048577), "       1.0 MB");
   EXPECT_EQ(byteText(1.073741824e12), " 1024000.0 MB");  // GB only above 1000 GiB
   EXPECT_EQ(byteText(2.147483648e12), "    2000.0 GB");
-  std::ostringstream heading;
-  printHeading(heading, "I/O Summary");
-  EXPECT_EQ(heading.str(), "\nI/O Summary\n===========\n");
 }
 
 }  // namespace

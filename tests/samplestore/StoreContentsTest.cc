@@ -102,20 +102,5 @@ TEST(SampleStoreContents, BootsChainByTheirHeadersAndTheUpdateStartsANewVersion)
   EXPECT_EQ(chained, boots.size());
 }
 
-// Only wakes start segments: each boot has as many as the generator ran it,
-// and the boots follow each other on the wall clock.
-TEST(SampleStoreContents, EachWakeStartsASegmentAndBootsFollowEachOther) {
-  const auto& store = sharedStore();
-  std::uint64_t lastBootEnd = 0;
-  for (std::size_t b = 0; b < store.boots.size(); ++b) {
-    SCOPED_TRACE("boot " + std::to_string(b));
-    const BootSummary& boot = store.report.boots[b];
-    const BootTimeline timeline(boot.uuid, boot.lastUuid, store.boots[b]);
-    EXPECT_EQ(timeline.segmentCount(), boot.runs);
-    EXPECT_LT(lastBootEnd, timeline.startWallTime());
-    lastBootEnd = timeline.endWallTime();
-  }
-}
-
 }  // namespace
 }  // namespace bw::samplestore

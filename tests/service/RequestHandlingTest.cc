@@ -43,7 +43,6 @@ TEST_F(RequestHandling, MalformedAndRefusedRequestsGetTheirErrorTexts) {
     const char* error;
   } cases[] = {
       {{}, true, "Expected string request_type in request"},
-      {{{"request_type", std::uint64_t{1}}}, true, "Expected string request_type in request"},
       {{{"request_type", std::int64_t{1}}}, true, "Expected string request_type in request"},
       {{{"request_type", std::vector<std::string>{"battery_charge_graph"}}},
        true,
@@ -83,13 +82,7 @@ TEST_F(RequestHandling, BatteryGraphTakesADataEndUnderFiveSecondsAheadAsNow) {
   const MessageDictionary reply = request({{"request_type", "battery_charge_graph"}});
   EXPECT_EQ(get<std::uint64_t>(reply, "time_since_full_charge"), 0u);
   EXPECT_EQ(get<std::vector<std::uint64_t>>(reply, "charge_times").front(), 93u);
-
-  setNow(end - 5000);
-  test::thrown(
-      [&] {
-        request({{"request_type", "battery_charge_graph"}});
-      },
-      kInternalInconsistencyException, "wall time was less than last wall time in data");
+  // Five seconds ahead ends the service: BusServiceTest runs it.
 }
 
 TEST_F(RequestHandling, BatteryGraphNeedsExactlyOneModelOfTheRunningBuild) {

@@ -3,11 +3,9 @@
 #include <filesystem>
 #include <sstream>
 
-#include "base/Console.h"
 #include "base/Exception.h"
 #include "store/Cleanup.h"
 #include "store/StatsFileList.h"
-#include "support/ConsoleCapture.h"
 #include "support/FakePlatform.h"
 #include "support/TempDir.h"
 #include "support/Thrown.h"
@@ -63,15 +61,6 @@ TEST(StatsFileList, MissingLocalDirectoriesGiveAnEmptyList) {
   test::TempDir root;
   test::FakePlatform fake(root.path());
   EXPECT_TRUE(statsFileList(StoreQuery()).empty());
-}
-
-TEST(StatsFileList, DebugLinesNameEachScannedDirectory) {
-  test::TempDir dir;
-  dir.write("a.stats");
-  test::ConsoleCapture console;
-  statsFileList(fromQuery(dir.path(), Date{0}));
-  EXPECT_EQ(console.err.str(),
-            "Adding files from " + dir.path() + " recursively (periodic files newer than 1970-01-01 00:00:00 +0000)\n");
 }
 
 class Cleanup : public ::testing::Test {

@@ -6,7 +6,6 @@
 #include <limits>
 
 #include "Events.h"
-#include "model/Model.h"
 #include "support/ConsoleCapture.h"
 
 namespace bw {
@@ -141,26 +140,6 @@ TEST(BatteryFeed, FullChargeFromEitherRecordAndPercentStaysWithin0To100) {
   EXPECT_EQ(s.chargeAtPosition(20), 5334);     // 5333.67
   EXPECT_EQ(s.maxChargeAtPosition(39), 6001);  // 6000.97
   EXPECT_DOUBLE_EQ(s.percentChargeAtPosition(40), 3001.0 * 100 / 6001);
-}
-
-TEST(BatteryModel, TopPowerSummariesPutTheHeaviestDrainFirst) {
-  Model model(std::make_unique<Timeline>(), "test");
-  Summarizer& power = *model.summarizer("Power");
-  feed(power, level(5000, 6000, 12000), 0);
-  feed(power, level(4500, 6000, 12000), kHour);
-  feed(power, level(3500, 6000, 12000), 2 * kHour);
-  feed(power, level(3500, 6000, 12000), 3 * kHour);  // flat: power 0, full weight; then open for good
-  const auto top = model.summarizeTop("Power", {{0, 5 * kHour}}, [](const Summary& s) {
-    return static_cast<const PowerSummary&>(s).avgPowerDenom() > 0;
-  });
-  ASSERT_EQ(top.size(), 3u);
-  EXPECT_DOUBLE_EQ(average(*top[0]), -12000);
-  EXPECT_EQ(top[0]->range(), (Range{kHour, kHour}));
-  EXPECT_DOUBLE_EQ(average(*top[1]), -6000);
-  EXPECT_EQ(average(*top[2]), 0);
-  PowerSummary a, b;
-  a.setAvgPowerNumer(-1), a.setAvgPowerDenom(3), b.setAvgPowerNumer(-2), b.setAvgPowerDenom(6);
-  EXPECT_EQ(power.comparator()(a, b), 0);  // equal within the double epsilon
 }
 
 }  // namespace

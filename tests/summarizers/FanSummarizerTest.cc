@@ -17,13 +17,6 @@ FanState fan(std::int32_t loudness) {
   return test::make<FanState>([&](FanState& r) { r.setLoudness(loudness); });
 }
 
-TEST(FanSummarizer, LoudnessGivesTheClass) {
-  const std::pair<std::int32_t, FanClass> table[] = {
-      {-3, FanClass::QuietOrOff}, {0, FanClass::QuietOrOff},   {1, FanClass::QuietOrOff},  {2, FanClass::Audible},
-      {3, FanClass::Annoying},    {4, FanClass::VeryAnnoying}, {9, FanClass::VeryAnnoying}};
-  for (auto [loudness, c] : table) EXPECT_EQ(fanClassOfLoudness(loudness), c) << loudness;
-}
-
 TEST(FanSummarizer, StateHoldsFromTheFirstAudibleSampleToTheFirstQuieterOne) {
   FanSummarizer s;
   feedAt(s, fan(1), 10);

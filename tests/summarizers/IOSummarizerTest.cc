@@ -48,9 +48,6 @@ TEST(IOSummary, EachAbsoluteRangeAddsOneEntryPerKeyAndRebootsStartAfresh) {
     EXPECT_EQ(summary[IOSummary::keys()[k]], (Entries{200 * place, 30 * place})) << IOSummary::keys()[k];
   }
   EXPECT_EQ(summary.totalBytes(), (3 + 4 + 7 + 8) * 230.0);
-  EXPECT_EQ(IOSummary::keys()[0], "Disk Reads");
-  EXPECT_EQ(IOSummary::keys()[5], "Packets Sent");
-  EXPECT_EQ(IOSummary::keys()[7], "Bytes Sent");
 }
 
 TEST(IOSummary, MoreBytesRankAboveMorePacketsAndTiesGoByTime) {

@@ -95,21 +95,5 @@ TEST_F(SwapDiskLookup, PartitionOnASolidStateDiskNamesTheParentDiskARotatingOneN
   EXPECT_TRUE(platform.assumptionLogLines.empty());
 }
 
-TEST_F(SwapDiskLookup, FailuresGoToTheAssumptionLogWithTheErrorNumber) {
-  EXPECT_FALSE(lookUp().productName);  // no /proc/swaps at all
-  root.write("proc/swaps", "Filename\tType\tSize\tUsed\tPriority\n");
-  EXPECT_FALSE(lookUp().productName);
-  root.write("proc/swaps", "Filename\tType\tSize\tUsed\tPriority\n/gone\tfile\t1\t0\t-2\n");
-  EXPECT_FALSE(lookUp().productName);
-  swapFile("sdz");
-  std::filesystem::remove_all(root / "sys/dev/block");
-  EXPECT_FALSE(lookUp().productName);
-  ASSERT_EQ(platform.assumptionLogLines.size(), 4u);
-  EXPECT_EQ(platform.assumptionLogLines[0], format("Swap disk lookup: cannot read /proc/swaps: %d", ENOENT));
-  EXPECT_EQ(platform.assumptionLogLines[1], "Swap disk lookup: no swap in use: 0");
-  EXPECT_EQ(platform.assumptionLogLines[2], format("Swap disk lookup: stat /gone: %d", ENOENT));
-  EXPECT_TRUE(platform.assumptionLogLines[3].starts_with("Swap disk lookup: no block device "));
-}
-
 }  // namespace
 }  // namespace bw

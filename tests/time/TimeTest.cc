@@ -7,9 +7,7 @@
 #include <cstdlib>
 #include <ctime>
 #include <deque>
-#include <map>
 #include <random>
-#include <set>
 #include <sstream>
 
 #include "Records/LogStartsV0.h"
@@ -184,20 +182,6 @@ TEST_F(TimeTest, WalksGivePositionWallAndAbsoluteTimeAndOnlyPlainWalksStop) {
   const std::vector<Range> twoRanges{{50, 1}, {750, 51}}, one{{700, 100}};  // a range's end is not inside it
   EXPECT_EQ(calls(*t, &twoRanges), (Calls{{50, 10050, 50}, {750, 10750, 250}, {800, 10800, 300}}));
   EXPECT_EQ(calls(*t, &one), (Calls{{700, 10700, 200}, {750, 10750, 250}}));
-}
-
-TEST_F(TimeTest, LookupsFollowChangesMadeAfterAnEarlierLookup) {
-  auto t = std::make_unique<Timeline>(), inner = std::make_unique<Timeline>();
-  AbsoluteTimeline* segmentA = segment({{0, 10000}, {100, 0}}).release();
-  inner->addObject(std::unique_ptr<Timeline>(segmentA));
-  t->addObject(std::move(inner));
-  EXPECT_EQ(t->duration(), 100u);
-  segmentA->addObject(idle(150));
-  EXPECT_EQ(std::pair(t->duration(), t->wallTimeForRelative(150)), std::pair(std::uint64_t{150}, std::uint64_t{10150}));
-  segmentA->adjustSkew(-10000);
-  EXPECT_EQ(t->wallTimeForRelative(150), 150u);
-  t->addObject(segment({{1000, 20000}}));  // starts 19850 ms of wall clock after the first child
-  EXPECT_EQ(t->duration(), 150u + 19850u);
 }
 
 // --- the literal walk: child offsets worked out step by step ---------------
@@ -416,63 +400,6 @@ TEST_F(TimeTest, ABootIsSortedByAbsoluteTimeKeepingTiesInOrderAndBeginsWithAVers
   std::vector<const Record*> order;
   for (const RecordRef& r : refs) order.push_back(r.decoded());
   EXPECT_EQ(order, (std::vector<const Record*>{first, early, late, last}));
-}
-
-// A run of boots with sleeps, a clock set back, a clock set late and a boot that cannot
-// be chained: every record's position leads back to its wall time and absolute time.
-TEST_F(TimeTest, EveryRecordsPositionMapsBackToItsWallTimeAndAbsoluteTime) {
-  // A: an hour's sleep after tick 3000, then the clock set back so that the
-  // third segment touches the second. Ends at wall kWall + 3610500.
-  boots_[kA] = {header(1000, kWall),
-                idle(2000),
-                idle(3000),
-                wake(3500, kWall + 3602500),
-                idle(4000),
-                idle(8000),
-                clockSet(9000, kWall + 3607000),
-                idle(9500),
-                idle(12500)};
-  const std::uint64_t bStart = kWall + 3610500 + 600000;  // B: ten minutes after A, with one sleep
-  boots_[kB] = {header(500, bStart, "23A344", kA), idle(700), wake(800, bStart + 90300), idle(5000)};
-  // C: starts on a 1970 clock that is set at tick 300.
-  boots_[kC] = {header(100, 5100, "23A344", kB), idle(200), clockSet(300, bStart + 200000), idle(900)};
-  boots_[kD] = {header(0, kWall - 100000), idle(10)};
-  std::map<const Record*, Uuid> bootOf;
-  for (const auto& [id, records] : boots_)
-    for (const RecordRef& r : records) bootOf[r.decoded()] = id;
-  auto timelines = sequenceBoots(boots_);
-  EXPECT_EQ(console_.out.str(), warning({kD}));
-  const Timeline& timeline = *timelines.at("23A344");
-  std::set<std::uint64_t> segmentStarts;  // where each segment starts, and its extent in absolute time
-  std::vector<std::pair<Uuid, Range>> segmentSpans;
-  timeline.enumerateTimelinesWithOffset(0, [&](const Timeline& boot, std::uint64_t offset, bool&) {
-    boot.enumerateTimelinesWithOffset(offset, [&](const Timeline& child, std::uint64_t x, bool&) {
-      const auto& segment = static_cast<const AbsoluteTimeline&>(child);
-      segmentStarts.insert(x);
-      segmentSpans.emplace_back(segment.bootUuid(), Range{segment.startAbsoluteTime(), segment.duration()});
-    });
-  });
-  EXPECT_EQ(segmentSpans.size(), 6u);  // A: 3, B: 2, C: 1
-  std::size_t walked = 0, absChecked = 0;
-  std::uint64_t lastPosition = 0;
-  timeline.enumerateEventsUsingBlock(
-      [&](const Record& r, std::uint64_t position, std::uint64_t wall, const AbsTime& abs, bool&) {
-        ++walked;
-        EXPECT_GE(position, lastPosition);
-        lastPosition = position;
-        EXPECT_EQ(pairOf(abs), std::pair(bootOf.at(&r), r.absoluteTime()));
-        EXPECT_TRUE(r.wallTime() <= BootTimeline::kClockSetWallTime || wall == r.wallTime()) << position;
-        EXPECT_EQ(timeline.wallTimeForRelative(position), wall) << position;
-        if (segmentStarts.count(position) == 0 && ++absChecked) {
-          EXPECT_EQ(lookup(timeline, position, 0).second, abs.time) << position;
-        }
-      });
-  EXPECT_EQ(walked, 9u + 4u + 4u);
-  EXPECT_EQ(absChecked, walked - 6 - 1);  // the touching segment's start holds two records
-  std::vector<std::pair<Uuid, Range>> ranges;
-  for (const AbsRange& r : timeline.absoluteRangesForRelativeRange(Range{0, timeline.duration()}))
-    ranges.emplace_back(r.boot(), r.range());
-  EXPECT_EQ(ranges, segmentSpans);
 }
 
 TEST(AbsRange, SpansTwoTimesOfOneBootOnly) {
