@@ -36,21 +36,6 @@ TEST(ValueText, StringsAreQuotedOnlyWhenTheyHoldOtherCharacters) {
   EXPECT_EQ(describeValue(Value("say \"hi\"\n")), "\"say \\\"hi\\\"\\n\"");
 }
 
-TEST(ValueText, NumbersPrintTheirShortestText) {
-  EXPECT_EQ(describeValue(Value(true)), "1");
-  EXPECT_EQ(describeValue(Value(false)), "0");
-  EXPECT_EQ(describeValue(Value(std::int64_t{-42})), "-42");
-  EXPECT_EQ(describeValue(Value(~std::uint64_t{0})), "18446744073709551615");
-  EXPECT_EQ(describeValue(Value(3.0)), "3");
-  EXPECT_EQ(describeValue(Value(0.1)), "0.1");
-}
-
-TEST(ValueText, DataPrintsHexInGroupsOfFourBytes) {
-  Data d{0x01, 0x02, 0x03, 0x04, 0xab, 0xcd};
-  EXPECT_EQ(describeValue(Value(d)), "<01020304 abcd>");
-  EXPECT_EQ(describeValue(Value(Data{})), "<>");
-}
-
 // The hot text writers' integers print as printf prints them.
 TEST(DecimalText, MatchesPrintfForEveryWidthAndFlag) {
   char expected[64];

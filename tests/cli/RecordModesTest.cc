@@ -161,24 +161,5 @@ TEST_F(RecordModes, DumpPrintsEachRecordsDictionaryUnderItsBoot) {
                        bootCHeader("4000000", "1704073000000"));
 }
 
-TEST_F(RecordModes, DumpStartsABootHeaderAgainForEveryModelAndSkipsEmptyOnes) {
-  // Boot B's header as above, then its first gauge sample.
-  const std::string out = run({"--dump", "-R", "899000.2000"}).out;
-  EXPECT_EQ(out.substr(0, out.find('\n', out.find('\n') + 1) + 1),
-            "===== Boot BBBBBBBB-0000-0000-0000-000000000002 =====\nLogStartsV1 {\n");
-  EXPECT_EQ(out.substr(out.find("}\n") + 2),
-            "BatteryChargeLevel {\n"
-            "    absoluteTime = 1500;\n"
-            "    charge = 3800;\n"
-            "    cycleCount = 12;\n"
-            "    instantVoltage = 11700;\n"
-            "    maxCharge = 5000;\n"
-            "}\n");
-  test::ToolResult both = run({"--dump", "-R", "0.150"});
-  EXPECT_EQ(both.out.substr(0, both.out.find('\n') + 1), "===== Boot AAAAAAAA-0000-0000-0000-000000000001 =====\n");
-  EXPECT_NE(both.out.find("}\n===== Boot CCCCCCCC-0000-0000-0000-000000000003 =====\nLogStartsV1 {\n"),
-            std::string::npos);
-}
-
 }  // namespace
 }  // namespace bw

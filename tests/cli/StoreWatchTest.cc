@@ -1,6 +1,5 @@
-// The reading watch in-process, with a settable clock and a captured
-// standard error: when the progress line appears, how it erases itself, and
-// the damage summary's wording.
+// The reading watch in-process: each damaged boot counted once, and the
+// damage summary's wording (TerminalTest shows it at the end of real runs).
 #include <gtest/gtest.h>
 
 #include <sstream>
@@ -30,34 +29,6 @@ class StoreWatchTest : public ::testing::Test {
   test::ConsoleCapture console{0};
   std::ostringstream &out = console.out, &err = console.err;
 };
-
-TEST_F(StoreWatchTest, ProgressShowsAfterASecondAndErasesItself) {
-  StoreWatch watch;  // starts at the fake clock's 1000 ms
-  watch.begin(4);
-  platform.absoluteMs = 1999;
-  watch.fileRead("a.stats", records(3));
-  EXPECT_EQ(err.str(), "");  // under a second: silent
-  platform.absoluteMs = 2000;
-  watch.fileRead("b.stats", records(2));
-  EXPECT_EQ(err.str(), "\rreading the store: 2/4 files, 5 records, 1 s\033[K");
-  platform.absoluteMs = 2050;  // too soon to redraw
-  watch.fileRead("c.stats", records(1));
-  platform.absoluteMs = 3500;
-  watch.fileRead("d.stats", records(0));
-  EXPECT_EQ(err.str(),
-            "\rreading the store: 2/4 files, 5 records, 1 s\033[K"
-            "\rreading the store: 4/4 files, 6 records, 2 s\033[K");
-  err.str("");
-  watch.step("feeding model 1 of 2");  // later steps keep the line up
-  EXPECT_EQ(err.str(), "\rreading the store: 4/4 files, 6 records, 2 s, feeding model 1 of 2\033[K");
-  err.str("");
-  terminalNote("a note");  // a note first erases the line
-  EXPECT_EQ(err.str(), "\r\033[Kbrindlewick: a note\n");
-  err.str("");
-  watch.end();
-  EXPECT_EQ(err.str(), "");  // already erased
-  EXPECT_EQ(out.str(), "");
-}
 
 TEST_F(StoreWatchTest, DamageCountsEachBootOnceAndWordsTheSummary) {
   {

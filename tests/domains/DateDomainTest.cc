@@ -59,14 +59,5 @@ TEST(DateDomain, UnknownAbbreviationTakesTheDayFromTheOffsetAcrossAMonthEnd) {
             "Time zone change! Now offset is 3600. Adjusting start/end to 1706655600000-1706742000000\n");
 }
 
-TEST(DateDomain, DayEndIsOneCalendarDayLaterInTheProcessZone) {
-  // Tokyo's 2024-03-31 begins at 03-30 15:00 UTC; the process zone (Paris)
-  // springs forward that night, so its calendar day is 23 hours long.
-  DateDomain domain({2024, 3, 31});
-  feed(domain, zoneChange("JST", 32400), 0, 1'711'810'000'000);
-  EXPECT_EQ(domain.start(), 1'711'810'800'000u);
-  EXPECT_EQ(domain.end() - domain.start(), 23u * 3'600'000);
-}
-
 }  // namespace
 }  // namespace bw

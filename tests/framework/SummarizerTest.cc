@@ -83,29 +83,5 @@ TEST(Summarizer, RangesFollowTheAnswersTheBootsSleepsAndTheLastPositionAsTheFlag
   }
 }
 
-struct CountingContext : SummarizerContext {
-  const char* className() const override { return "CountingContext"; }
-  int records = 0;
-};
-
-TEST(Summarizer, ContextsAreMadePerBootAndAFreshContextIsABootChange) {
-  IdleSummarizer s;
-  s.setStartAtBoot(true);
-  s.setContextClass("CountingContext", [] { return std::make_shared<CountingContext>(); });
-  s.setEventHandler([](const Record&, SummarizerContext* c) {
-    ++static_cast<CountingContext*>(c)->records;
-    return -1;
-  });
-  EXPECT_EQ(s.contextForBoot(kBoot1), nullptr);
-  s.feed(10, 1);
-  s.feed(20, 1);
-  s.feed(30, 1, kBoot2);
-  s.feed(40, 1);  // back on boot 1: its context exists, yet the last record was on boot 2
-  ASSERT_NE(s.contextForBoot(kBoot1), nullptr);
-  EXPECT_EQ(static_cast<CountingContext*>(s.contextForBoot(kBoot1))->records, 3);
-  EXPECT_EQ(static_cast<CountingContext*>(s.contextForBoot(kBoot2))->records, 1);
-  EXPECT_EQ(s.contextForBoot(test::bootNamed(9)), nullptr);
-}
-
 }  // namespace
 }  // namespace bw

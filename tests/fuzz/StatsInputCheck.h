@@ -78,12 +78,6 @@ inline std::string reencodeProblem(const Record& r) {
   return {};
 }
 
-inline std::size_t countRecords(const RecordsByBoot& r) {
-  std::size_t n = 0;
-  for (const auto& [boot, records] : r.boots) n += records.size();
-  return n;
-}
-
 // Records kept decoded: the headers, which the storage must hold, no more.
 inline std::size_t keptDecoded(const RecordsByBoot& r) {
   std::size_t n = 0;

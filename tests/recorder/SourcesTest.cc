@@ -1,6 +1,5 @@
 // Every source against fixture trees of /sys and /proc, through the
 // Recorder, with the records read back from the store by the project's reader.
-#include <fcntl.h>
 #include <unistd.h>
 
 #include "RecorderFixture.h"
@@ -139,33 +138,6 @@ TEST(RecorderSources, CpuidleAndRaplCountersMakePackageRecords) {
   EXPECT_EQ(fieldsOf(second.cstates[0]),
             "{ absolute_time = 2000; core = -1; is_core = 0; states = ( { level = 1; residency = 200; }, { level = 2; "
             "residency = 500; } ); }");
-}
-
-TEST(RecorderSources, PackageMsrsWinOverTheCpuidleApproximation) {
-  MachineTree tree;
-  writeCpus(tree, 0, 0, 0, 0, 0);
-  tree.put("/dev/cpu/0/msr", "");
-  const int fd = ::open((tree.dir / "dev/cpu/0/msr").c_str(), O_WRONLY);
-  ASSERT_GE(fd, 0);
-  // In a plain file neighbouring MSR numbers overlap; C2 has no neighbours.
-  const std::uint64_t c2 = 2400ull * 1000 * 1500;  // 1.5 s at 2.4 GHz
-  ASSERT_EQ(::pwrite(fd, &c2, 8, 0x60D), 8);
-  const std::uint64_t zero = 0;
-  ASSERT_EQ(::pwrite(fd, &zero, 8, 0x632), 8);
-  ::close(fd);
-  recorder::MachineFiles machine(tree.dir.path());
-  recorder::CpuSource cpu(machine);
-  const auto sample = cpu.read(1000);
-  ASSERT_TRUE(sample.package);
-  EXPECT_EQ(sample.package->pkgCanyResidency(), 1500u);
-  EXPECT_EQ(sample.package->pkgCmaxResidency(), 1500u);
-  ASSERT_EQ(sample.cstates.size(), 3u);  // the MSRs' package record, then both CPUs from cpuidle
-  EXPECT_EQ(sample.cstates[0].core(), -1);
-  ASSERT_EQ(sample.cstates[0].statesCount(), 7u);
-  EXPECT_EQ(sample.cstates[0].statesAtIndex(0).level(), 2u);
-  EXPECT_EQ(sample.cstates[0].statesAtIndex(0).residency(), 1500u);
-  EXPECT_EQ(sample.cstates[0].statesAtIndex(2).residency(), 0u);
-  EXPECT_TRUE(sample.cstates[1].isCore());
 }
 
 TEST(RecorderSources, CountersOfWholeDisksNetworksInterruptsAndMemory) {

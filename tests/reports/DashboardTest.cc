@@ -46,9 +46,7 @@ void writeTwoBootStore(const test::TempDir& dir, bool laptop) {
   Sample app{.uniqueid = 10, .at = 2000, .name = "App", .responsible = 10, .start = 500, .resident = 100 * kMiB};
   Sample helper{.uniqueid = 11, .at = 2000, .name = "helper", .parent = 10, .start = 1500, .resident = kMiB};
   a.append(test::processUsage(app)), a.append(test::processUsage(helper));
-  UserIdle idle = test::userIdle(1);
-  idle.setAbsoluteTime(1801000);
-  a.append(idle);
+  a.append(test::idle(1801000));
   if (laptop) a.append(gauge(3601000, 3500));
   a.append(test::packageSample(3601000, 500 + 3240000)), a.append(test::diskRead(3601000, 2 * kGiB));
   app.at = helper.at = 3601000;

@@ -208,16 +208,6 @@ TEST(TelemetryFields, KeysAndValuesAreCutAndNumbersRounded) {
   EXPECT_EQ(m.fields()[2].second, "0");
 }
 
-TEST(TelemetryFields, DebugPrintsEveryFieldAndSendsNothing) {
-  test::ConsoleCapture console;
-  CapturingSink sink;
-  TelemetryMessage m("d");
-  m.setField("ac", "x", "1");
-  finishMessage(m, sink);
-  EXPECT_EQ(console.err.str(), "com.vexil.message.ac.x: 1\n");
-  EXPECT_TRUE(sink.messages.empty());
-}
-
 TEST(TelemetryFields, JournalFieldsAreUpperCaseWithUnderscores) {
   EXPECT_EQ(journalFieldName("com.vexil.message.battery-wake.avg_power"), "COM_VEXIL_MESSAGE_BATTERY_WAKE_AVG_POWER");
   EXPECT_EQ(journalFieldName("com.vexil.message.device.wi-fi"), "COM_VEXIL_MESSAGE_DEVICE_WI_FI");

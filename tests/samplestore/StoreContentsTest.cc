@@ -74,24 +74,13 @@ TEST(SampleStoreContents, BootsChainByTheirHeadersAndTheUpdateStartsANewVersion)
   ASSERT_GE(boots.size(), 2u);
   EXPECT_EQ(store.read.boots.count(boots[0].lastUuid), 0u) << "the boot before the store is gone";
   int updates = 0;
-  for (std::size_t b = 0; b < boots.size(); ++b) {
-    SCOPED_TRACE("boot " + std::to_string(b));
-    EXPECT_EQ(store.boots[b].front()->recordClass(), RecordClass::LogStartsV1);
-    for (const Record* r : store.boots[b]) {
-      const LogStartsV1* h = recordCast<LogStartsV1>(r);
-      if (h == nullptr) continue;
-      EXPECT_EQ(h->bootUUID(), boots[b].uuid);
-      EXPECT_EQ(h->lastBootUUID(), boots[b].lastUuid);
-      EXPECT_EQ(h->systemVersion(), boots[b].systemVersion);
-      EXPECT_EQ(h->lastSystemVersion(), boots[b].lastSystemVersion);
-    }
-    if (b == 0) continue;
+  for (std::size_t b = 1; b < boots.size(); ++b) {
     EXPECT_EQ(boots[b].lastUuid, boots[b - 1].uuid);
     EXPECT_EQ(boots[b].lastSystemVersion, boots[b - 1].systemVersion);
     updates += boots[b].systemVersion != boots[b - 1].systemVersion;
   }
   EXPECT_EQ(updates, 1);
-  // Sequencing keeps every boot: one chain per version, no warning.
+  // Sequencing the headers read back keeps every boot: one chain per version, no warning.
   BootRecords copy = store.read.boots;
   test::ConsoleCapture console(0);
   const auto timelines = sequenceBoots(copy);

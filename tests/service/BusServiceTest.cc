@@ -7,7 +7,6 @@
 #include <atomic>
 #include <thread>
 
-#include "base/Platform.h"
 #include "cli/Run.h"
 #include "service/AnalysisService.h"
 #include "service/RequestDispatch.h"
@@ -15,7 +14,6 @@
 #include "service/ServiceStores.h"
 #include "support/FakePlatform.h"
 #include "support/PrivateBus.h"
-#include "support/RunTool.h"
 
 namespace bw {
 namespace {
@@ -210,77 +208,6 @@ TEST_F(BusService, AJobReportWaitsForTheSamplerWhenOneIsOnTheBus) {
   FakeSampler sampler(*bus, store / "sampled.stats", true);
   EXPECT_EQ(firstLabel(), std::vector<std::string>{"fresh"});
   EXPECT_EQ(sampler.requests(), 1);
-}
-
-TEST_F(BusService, TheSamplerPairWaitsOnlyForAnOwnerAndOnlyUntilItsTimeout) {
-  sd_bus* service = bus->connect();
-  sd_bus* waiting = bus->connect();
-  SamplerPair pair(service, waiting, std::chrono::milliseconds(200));
-  EXPECT_EQ(pair.sampleProcesses(), SamplerPair::Outcome::NoSampler);
-  {
-    FakeSampler silent(*bus, store / "silent.stats", false);
-    test::FakePlatform fake;
-    EXPECT_EQ(pair.sampleProcesses(), SamplerPair::Outcome::TimedOut);
-    EXPECT_EQ(pair.sampleProcesses(), SamplerPair::Outcome::TimedOut);
-    EXPECT_EQ(fake.systemLogLines.size(), 1u);  // logged once
-    EXPECT_EQ(silent.requests(), 2);
-  }
-  FakeSampler answering(*bus, store / "answered.stats", true);
-  EXPECT_EQ(pair.sampleProcesses(), SamplerPair::Outcome::Answered);
-  sd_bus_flush_close_unref(service);
-  sd_bus_flush_close_unref(waiting);
-}
-
-// The real binary: the name, introspection, the bus tools' view of a reply,
-// a second instance, and --xpc-debug.
-TEST_F(BusService, TheToolServesTheNameOnceAndIntrospects) {
-  const std::string version = *platform().currentSystemVersion();
-  const std::uint64_t start = static_cast<std::uint64_t>(platform().nowMicroseconds() / 1000) - 200000;
-  test::TempDir live;
-  test::writeBatteryStore(live / "battery.stats", *platform().currentBootUuid(), version, start);
-  const std::string dir = live.path();
-  const auto tool = [dir] {
-    execl(BRINDLEWICK_BINARY, "brindlewick", "--debug", "--xpc", "--from", dir.c_str(), static_cast<char*>(nullptr));
-    return 127;
-  };
-  ServiceProcess service(*bus, tool);
-  ASSERT_TRUE(service.running()) << service.err();
-
-  test::RunSettings env;
-  env.env["DBUS_SYSTEM_BUS_ADDRESS"] = bus->address();
-  const std::string address = "--address=" + bus->address();
-  test::ToolResult introspect =
-      test::runBinary("/usr/bin/busctl", {address, "introspect", kAnalysisName, kAnalysisPath, kAnalysisInterface});
-  EXPECT_NE(introspect.out.find(".Request"), std::string::npos) << introspect.out << introspect.err;
-  EXPECT_NE(introspect.out.find("method    a{sv}     a{sv}"), std::string::npos) << introspect.out;
-  EXPECT_NE(introspect.out.find(".SampleProcessesNow"), std::string::npos);
-
-  test::ToolResult called =
-      test::runBinary("/usr/bin/busctl", {address, "call", kAnalysisName, kAnalysisPath, kAnalysisInterface, "Request",
-                                          "a{sv}", "1", "request_type", "s", "battery_charge_graph"});
-  EXPECT_NE(called.out.find("\"charge_levels\" ad 5 80 78 78 76 74 \"charge_times\" at 5 "), std::string::npos)
-      << called.out << called.err;
-
-  ServiceProcess second(*bus, tool, false);
-  EXPECT_EQ(second.wait(), 1);
-
-  test::ToolResult debug = test::runTool({"--xpc-debug", "--from", dir});
-  EXPECT_EQ(debug.status, 0) << debug.err;
-  EXPECT_EQ(debug.out.rfind("a{sv} 7 \"battery_states\" ab 2 true false \"battery_times\" at 2 ", 0), 0u) << debug.out;
-  EXPECT_NE(debug.out.find("\"charge_levels\" ad 5 80 78 78 76 74 \"charge_times\" at 5 "), std::string::npos);
-}
-
-TEST_F(BusService, DbusStarterBusTypeSessionPicksTheSessionBus) {
-  const std::string dir = store.path();
-  const std::string address = bus->address();
-  ServiceProcess service(*bus, [dir, address] {
-    setenv("DBUS_SYSTEM_BUS_ADDRESS", "unix:path=/nonexistent/bus", 1);
-    setenv("DBUS_SESSION_BUS_ADDRESS", address.c_str(), 1);
-    setenv("DBUS_STARTER_BUS_TYPE", "session", 1);
-    execl(BRINDLEWICK_BINARY, "brindlewick", "--debug", "--xpc", "--from", dir.c_str(), static_cast<char*>(nullptr));
-    return 127;
-  });
-  EXPECT_TRUE(service.running()) << service.err();
 }
 
 }  // namespace

@@ -57,12 +57,6 @@ TEST(StatsFileList, LocalStoreReadsItsDirectoriesWithoutEnteringSubdirectories) 
   EXPECT_EQ(statsFileList(StoreQuery()), (FileList{own, launchd, user0, user501}));
 }
 
-TEST(StatsFileList, MissingLocalDirectoriesGiveAnEmptyList) {
-  test::TempDir root;
-  test::FakePlatform fake(root.path());
-  EXPECT_TRUE(statsFileList(StoreQuery()).empty());
-}
-
 class Cleanup : public ::testing::Test {
  protected:
   void SetUp() override {

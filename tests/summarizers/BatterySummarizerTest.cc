@@ -6,7 +6,6 @@
 #include <limits>
 
 #include "Events.h"
-#include "support/ConsoleCapture.h"
 
 namespace bw {
 namespace {
@@ -20,32 +19,6 @@ constexpr std::uint64_t kHour = 3600000;
 PowerSummary summarize(BatterySummarizer& s, Range range, PowerSummary summary = {}) {
   s.summarizePositions(summary, range);
   return summary;
-}
-
-double average(const Summary& s) {
-  const auto& p = static_cast<const PowerSummary&>(s);
-  return p.avgPowerNumer() / p.avgPowerDenom();
-}
-
-TEST(BatterySummary, DischargeGivesPowerWeightedBySecondsAndItsExtremes) {
-  BatterySummarizer s;
-  feed(s, level(5000, 6000, 12000), 0);
-  feed(s, level(4000, 6100, 11000), kHour);
-  test::ConsoleCapture console;
-  const PowerSummary p = summarize(s, {0, kHour});
-  EXPECT_EQ(console.err.str(), "Power [0.3600000]: Ah = -1, V = 11.5, h = 1 : mW = -11500\n");
-  EXPECT_EQ(p.deltaCharge(), -1000);
-  EXPECT_EQ(p.maxCharge(), 6100);  // the larger end
-  EXPECT_DOUBLE_EQ(average(p), -11500);
-  EXPECT_EQ(p.avgPowerDenom(), 3600);
-  EXPECT_DOUBLE_EQ(p.minPower(), -11500);
-  EXPECT_EQ(p.range(), (Range{0, kHour}));
-  // A slower second half hour: Ah -0.5, V 11.25, h 0.5.
-  const PowerSummary two = summarize(s, {kHour / 2, kHour / 2}, p);
-  EXPECT_DOUBLE_EQ(two.maxPower(), -11250);
-  EXPECT_EQ(two.maxPowerTime(), 1800);  // seconds, not a position
-  EXPECT_DOUBLE_EQ(two.minPower(), -11500);
-  EXPECT_EQ(two.minPowerTime(), 3600);
 }
 
 TEST(BatterySummary, ChargingAndSubSecondRangesAddNoPowerWeight) {

@@ -17,7 +17,6 @@ namespace {
 using test::boot;
 using test::feed;
 using test::make;
-using Levels = std::map<std::uint64_t, double>;
 constexpr std::uint64_t kMinute = 60000;
 
 struct Pkg {
@@ -49,40 +48,6 @@ CPUSummary summarize(CPUSummarizer& s, std::uint64_t start, std::uint64_t end, s
   return summary;
 }
 
-// Two minutes between package samples at 1 and 3 minutes: residency 0.75,
-// levels 3 and 6 at 0.25 and 0.5, 0.5 interrupts per ms, 2400 MHz.
-TEST(CPUSummary, HandComputedAveragesAndTheirDerivedFigures) {
-  CPUSummarizer s;
-  feed(s, pkg({.cany = 1000, .freq = 2400}), kMinute);  // no nominal frequency yet
-  feed(s, cstates(-1, {{3, 1000}, {6, 1000}}), kMinute);
-  feed(s, interrupts({}), kMinute);                      // an empty record: a total of 0 here
-  feed(s, cstates(0, {{3, 0}, {9, 500}}), 2 * kMinute);  // a core's record changes nothing
-  feed(s, pkg({.cany = 91000, .freq = 2000, .nominal = 2600}), 3 * kMinute);
-  feed(s, cstates(-1, {{3, 31000}, {6, 61000}}), 3 * kMinute);
-  feed(s, interrupts({40000, 20000}), 3 * kMinute);
-  feed(s, pkg({.cany = 100000, .freq = 2000, .nominal = 3000}), 4 * kMinute);  // a later nominal is ignored
-
-  const CPUSummary c = summarize(s, kMinute, 3 * kMinute);
-  EXPECT_DOUBLE_EQ(c.avgCStateResidencyNumer(), 90000);
-  EXPECT_EQ(c.avgCStateResidencyDenom(), 120000);
-  ASSERT_TRUE(c.avgCStateResidencyBreakdown());
-  EXPECT_EQ(*c.avgCStateResidencyBreakdown(), (Levels{{3, 30000}, {6, 60000}}));
-  EXPECT_DOUBLE_EQ(c.avgInterruptRateNumer(), 60000);
-  EXPECT_EQ(c.avgInterruptRateDenom(), 120000);
-  EXPECT_DOUBLE_EQ(c.avgPkgFrequencyNumer(), 2400.0 * 120000);  // the samples within [start, end)
-  EXPECT_EQ(c.nominalPkgFrequency(), 2600);
-  EXPECT_EQ(c.qosDenom(), 0);  // no QoS counters at all
-
-  EXPECT_DOUBLE_EQ(averagePkgFrequencyGHz(c), 2.4);
-  EXPECT_EQ(interruptRateHz(c), 500);
-  EXPECT_DOUBLE_EQ(cStateResidencyPercent(c), 75);
-  EXPECT_DOUBLE_EQ(cStateLevelPercent(c, 3), 25);
-  EXPECT_DOUBLE_EQ(cStateLevelPercent(c, 6), 50);
-  EXPECT_TRUE(std::isnan(cStateLevelPercent(c, 9)));
-  EXPECT_TRUE(std::isnan(backgroundQoSRatioPercent(c)));
-  EXPECT_TRUE(std::isnan(averagePkgFrequencyGHz(CPUSummary{})));
-}
-
 TEST(CPUSummary, ARangeCountsFromOneMinuteOnAndWithoutADeepestStateCounter) {
   for (std::uint64_t length : {kMinute - 1, kMinute}) {
     SCOPED_TRACE(length);
@@ -104,7 +69,6 @@ TEST(CPUSummary, QoSNeedsBothSlopesAndIsClampedAboveOnly) {
   } cases[] = {
       {{.bg = 1000, .idle = 1000}, {.bg = 241000, .idle = 61000}, 120000, 60000, 120000},  // bg slope 2 counts as 1
       {{.bg = 1000}, {.bg = 61000}, 0, 0, 0},                                              // idle never sampled
-      {{.idle = 1000}, {.idle = 61000}, 0, 0, 0},                                          // bg never sampled
   };
   for (const Case& k : cases) {
     CPUSummarizer s;

@@ -10,11 +10,7 @@ namespace {
 using test::feed;
 
 DeviceChange device(std::uint32_t type, const std::string& name, const std::string& id, bool on) {
-  return test::make<DeviceChange>([&](DeviceChange& r) {
-    r.setDeviceType(type), r.setNowConnected(on ? 1 : 0);
-    if (!name.empty()) r.setDeviceName(name);
-    if (!id.empty()) r.setDeviceId(id);
-  });
+  return test::device(type, on ? 1 : 0, 0, name, id);
 }
 
 std::vector<std::string> names(const DeviceSummarizer& s, Range range, std::uint32_t type) {

@@ -37,8 +37,5 @@ inline SleepWake sleepWake(std::uint32_t reason, bool fromStandby = false, const
     if (!wakeType.empty()) r.setWakeType(wakeType);
   });
 }
-inline UserIdle userIdle(std::uint32_t change) {
-  return make<UserIdle>([&](UserIdle& r) { r.setChange(change); });
-}
 
 }  // namespace bw::test

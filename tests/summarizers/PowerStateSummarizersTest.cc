@@ -42,8 +42,8 @@ TEST(PowerStates, EachStateFollowsItsRecordsBootsAndShutdowns) {
   const PowerStateChange ac = test::powerChange(0), battery = test::powerChange(1);
   const PowerStateChange high = test::powerChange(std::uint64_t{1} << 32);  // compared as 32 bits: external power
   const UserIdle idle = test::idle(0, 1), active = test::idle(0, 0);
-  const DeviceChange wifiOn = test::device(5, 1), wifiOff = test::device(5, 0), btOn = test::device(6, 1);
-  const DeviceChange btOff = test::device(6, 0), gpuOn = test::device(9, 2), gpuOff = test::device(9, 0);
+  const DeviceChange wifiOn = test::device(5, 1), wifiOff = test::device(5, 0);
+  const DeviceChange gpuOn = test::device(9, 2), gpuOff = test::device(9, 0);
   const struct {
     const char* what;
     std::vector<Fed> records;
@@ -70,13 +70,9 @@ TEST(PowerStates, EachStateFollowsItsRecordsBootsAndShutdowns) {
         {"Wake", {{0, 100}}}}},
       // Wi-Fi already off changes nothing; any non-zero state turns a device on.
       {"devices follow their own type",
-       {{wifiOn, 10}, {btOn, 20}, {wifiOff, 30}, {wifiOff, 40}, {gpuOn, 50}, {btOff, 60}, {gpuOff, 70}},
+       {{wifiOn, 10}, {wifiOff, 30}, {wifiOff, 40}, {gpuOn, 50}, {gpuOff, 70}},
        100,
-       {{"Wi-Fi", {{10, 20}}},
-        {"Bluetooth", {{20, 40}}},
-        {"DiscreteGraphics", {{50, 20}}},
-        {"Wake", {{10, 90}}},
-        {"Active", {{10, 90}}}}},
+       {{"Wi-Fi", {{10, 20}}}, {"DiscreteGraphics", {{50, 20}}}, {"Wake", {{10, 90}}}, {"Active", {{10, 90}}}}},
   };
   for (const auto& c : cases) {
     States states;

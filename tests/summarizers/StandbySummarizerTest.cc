@@ -37,9 +37,6 @@ TEST(Standby, SleepEndedByAWakeFromStandbyIsARangeAndCountsByWakeType) {
   EXPECT_EQ(summary.darkWakesFromStandby(), 1u);
   EXPECT_EQ(summary.wakeTypes(), (Counts{{"RTC", 1}}));
   EXPECT_EQ(summary.duration(), 100u);
-  summary = summarize(s, {100, 50}, summary);
-  EXPECT_EQ(summary.duration(), 150u);
-  EXPECT_EQ(summary.wakesFromStandby(), 2u);
   // Wakes count after the range start up to and including its end.
   const StandbySummary rtc = summarize(s, {40, 10});
   EXPECT_EQ(rtc.wakeTypes(), (Counts{{"RTC", 1}}));
