@@ -29,13 +29,6 @@ DataSet samples(std::initializer_list<std::pair<std::uint64_t, double>> list) {
   return set;
 }
 
-TEST(DataSet, KeepsSamplesInPositionOrderWithoutMerging) {
-  DataSet set = samples({{20, 1}, {40, 2}, {30, 3}, {30, 4}});  // 30 is inserted, the second before the first
-  EXPECT_EQ(set.positions(), (std::vector<std::uint64_t>{20, 30, 30, 40}));
-  EXPECT_EQ(set.values(), (std::vector<double>{1, 4, 3, 2}));
-  EXPECT_EQ(set.maxPosition(), 40u);
-}
-
 TEST(DataSet, MaximumAndMeanOverTheSamplesInARange) {
   DataSet set = samples({{10, 4}, {20, 1}, {30, 7}, {40, 2}});
   const std::pair<Range, std::vector<double>> cases[] = {// max, mean
@@ -152,19 +145,6 @@ TEST(Ledger, TimeAboveZeroOverRange) {
 const Uuid kBoot = *Uuid::parse("0F0E0D0C-0B0A-0908-0706-050403020100");
 const Uuid kOther = *Uuid::parse("11111111-2222-3333-4444-555555555555");
 const Uuid kUnknown = *Uuid::parse("00000000-0000-0000-0000-000000000001");
-
-TEST(AbsoluteLedger, KeepsOneLedgerPerBoot) {
-  AbsoluteLedger a, b;
-  a.addCreditAtAbsoluteTime(AbsTime::timeWithBoot(kBoot, 10));
-  a.addDebitAtAbsoluteTime(AbsTime::timeWithBoot(kBoot, 30));
-  a.addCreditAtAbsoluteTime(5, kOther);
-  a.addDebitAtAbsoluteTime(8, kOther);
-  EXPECT_EQ(a.valueAtAbsoluteTime(AbsTime::timeWithBoot(kBoot, 20)), 1u);
-  EXPECT_EQ(a.creditsAtAbsoluteTime(AbsTime::timeWithBoot(kOther, 20)), 1u);
-  EXPECT_EQ(a.timeValueWasGreaterThanZeroOverRange(AbsRange::rangeWithBoot(kBoot, 0, 100)), 20u);
-  EXPECT_EQ(b.valueAtAbsoluteTime(AbsTime::timeWithBoot(kUnknown, 20)), 0u);  // leaves an empty ledger
-  EXPECT_NE(b.boots().objectForKeyedSubscript(kUnknown), nullptr);
-}
 
 std::shared_ptr<Interpolator> member(const Samples& samples) { return std::make_shared<Interpolator>(series(samples)); }
 

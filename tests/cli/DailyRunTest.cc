@@ -101,14 +101,6 @@ TEST(DailyDates, DaysRunFromTheDayAfterTheLastReportToYesterday) {
   }
 }
 
-TEST(DailyDates, APostInstallSpanIsCutToOneHourOnlyBeyondIt) {
-  EXPECT_EQ(firstHourOf({{100, 3600000}}), (std::vector<Range>{{100, 3600000}}));
-  EXPECT_EQ(firstHourOf({{100, 3600001}}), (std::vector<Range>{{100, 3600000}}));
-  EXPECT_EQ(firstHourOf({{0, 10}, {3599990, 10}}), (std::vector<Range>{{0, 10}, {3599990, 10}}));
-  EXPECT_EQ(firstHourOf({{0, 10}, {3599990, 11}}), (std::vector<Range>{{0, 3600000}}));
-  EXPECT_EQ(firstHourOf({}), std::vector<Range>{});
-}
-
 // The records come hourly and carry no wall time, so a day's range runs
 // from its first record to the first record after its end (25 hours), and
 // from the zone record, 500 ms into the boot, on the first day.

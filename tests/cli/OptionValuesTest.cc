@@ -92,14 +92,6 @@ TEST_F(OptionValues, BuildAndBootExcludeEachOther) {
   EXPECT_EQ(parse({"-B", "not-a-uuid"}).status, 64);
 }
 
-TEST_F(OptionValues, CurrentBootThatCannotBeReadLeavesTheFilterUnset) {
-  fake.bootUuid.reset();
-  Parsed p = parse({"-B", "current", "-b", "x"});
-  ASSERT_EQ(p.status, 0);
-  EXPECT_FALSE(p.options.only_boot_uuid());
-  EXPECT_EQ(p.options.only_system_version(), std::optional<std::string>("x"));
-}
-
 TEST_F(OptionValues, LaunchdTestHappensWhenTheOptionIsRead) {
   fake.ppid = 1;
   EXPECT_EQ(parse({"--daily"}).options.mode(), kModeDaily);
@@ -107,18 +99,6 @@ TEST_F(OptionValues, LaunchdTestHappensWhenTheOptionIsRead) {
   fake.ppid = 77;  // from a shell: CommandLineTest runs the refusal and the lift by --debug
   EXPECT_EQ(parse({"--xpc"}).status, 64);
   EXPECT_EQ(parse({"--xpc-debug"}).options.mode(), kModeServiceDebug);
-}
-
-TEST_F(OptionValues, DailyWithASampleRangeIsRefused) {
-  fake.ppid = 1;
-  for (std::vector<std::string> range :
-       {std::vector<std::string>{"-d", "today"}, {"-A", "1"}, {"-R", "1.2"}, {"-s", "x"}}) {
-    std::vector<std::string> args{"--daily"};
-    args.insert(args.end(), range.begin(), range.end());
-    Parsed p = parse(args);
-    EXPECT_EQ(p.status, 64) << range[0];
-    EXPECT_EQ(p.err, "brindlewick: --daily mode should not have a specified domain\n");
-  }
 }
 
 }  // namespace

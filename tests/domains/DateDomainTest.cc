@@ -47,17 +47,5 @@ TEST(DateDomain, AZoneChangeFromPlusOneToPlusTwoMovesBothBoundsAnHourEarlier) {
             "Time zone change! Now zone is Africa/Harare. Adjusting start/end to 1705269600000-1705356000000\n");
 }
 
-TEST(DateDomain, UnknownAbbreviationTakesTheDayFromTheOffsetAcrossAMonthEnd) {
-  ConsoleCapture capture;
-  DateDomain domain({2024, 1, 31});
-  feed(domain, zoneChange("XYZ", 3600), 0, 1'706'655'000'000);
-  EXPECT_EQ(domain.gmtoff(), 3600);
-  EXPECT_EQ(domain.start(), 1'706'655'600'000u);  // 2024-01-30 23:00 UTC
-  EXPECT_EQ(domain.end(), 1'706'742'000'000u);    // 2024-01-31 23:00 UTC
-  EXPECT_EQ(capture.err.str(),
-            "Selecting events from 2024-01-31\n"
-            "Time zone change! Now offset is 3600. Adjusting start/end to 1706655600000-1706742000000\n");
-}
-
 }  // namespace
 }  // namespace bw

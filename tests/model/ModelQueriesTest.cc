@@ -1,6 +1,5 @@
 #include <gtest/gtest.h>
 
-
 #include "model/Model.h"
 
 namespace bw {
@@ -42,12 +41,6 @@ TEST_F(ModelQueries, KeysIntersectTheirStatesWithinTheGivenRanges) {
   EXPECT_EQ(model.rangesForSubstates({"Even", "Wide"}, std::vector<Range>{{8, 14}}),
             (std::vector<Range>{{8, 2}, {20, 2}}));
   EXPECT_EQ(model.rangesForSubstates({"Even", "Late"}, std::nullopt), std::vector<Range>{});
-}
-
-TEST_F(ModelQueries, SummarizeAccumulatesOverRangesAndEndsAtTheLast) {
-  std::unique_ptr<Summary> s = model.summarize("Even", std::vector<Range>{{0, 4}, {10, 6}});
-  EXPECT_EQ(s->duration(), 10u);
-  EXPECT_EQ(s->range(), (Range{10, 6}));
 }
 
 TEST_F(ModelQueries, TopSummariesComeGreatestFirstWithoutEmptyOverlaps) {

@@ -53,52 +53,31 @@ TEST(RecorderProcesses, AppearForkAndExitWithServiceManagersNamedForTheJobRules)
 
   const auto store = rig.contents();
   const auto records = store.all<ProcessUsage>();
-  const ProcessUsage* init = find(records, 1, -1);
-  ASSERT_NE(init, nullptr);
-  EXPECT_EQ(init->name(), "launchd");
-  EXPECT_EQ(init->uniqueid(), 1u);
-  EXPECT_EQ(init->parentUniqueid(), 0u);
-  const ProcessUsage* manager = find(records, 800, -1);
-  ASSERT_NE(manager, nullptr);
-  EXPECT_EQ(manager->name(), "com.vexil.launchd.peruser");
-  EXPECT_EQ(manager->displayName(), "user@1000.service");
-  EXPECT_EQ(manager->parentUniqueid(), 1u);
+  const ProcessUsage *init = find(records, 1, -1), *manager = find(records, 800, -1), *kthread = find(records, 2, -1);
+  const ProcessUsage *service = find(records, 900, -1), *user950 = find(records, 950, -1);
+  const ProcessUsage *fork = find(records, 902, -1), *exit = find(records, 901, 0);
+  for (const ProcessUsage* r : {init, manager, kthread, service, user950, fork, exit}) ASSERT_NE(r, nullptr);
+  EXPECT_EQ(std::tuple(init->name(), init->uniqueid(), init->parentUniqueid()), std::tuple("launchd", 1u, 0u));
+  EXPECT_EQ(std::tuple(manager->name(), manager->displayName(), manager->parentUniqueid()),
+            std::tuple("com.vexil.launchd.peruser", "user@1000.service", 1u));
   EXPECT_EQ(manager->responsibleUniqueid(), manager->uniqueid());
-  const ProcessUsage* kthread = find(records, 2, -1);
-  ASSERT_NE(kthread, nullptr);
-  EXPECT_EQ(kthread->name(), "kthreadd");  // no executable: the command name
-  EXPECT_EQ(kthread->responsibleUniqueid(), 0u);
-  EXPECT_FALSE(kthread->hasDisplayName());
+  // No executable: the command name.
+  EXPECT_EQ(std::tuple(kthread->name(), kthread->responsibleUniqueid(), kthread->hasDisplayName()),
+            std::tuple("kthreadd", 0u, false));
 
-  const ProcessUsage* service = find(records, 900, -1);
-  ASSERT_NE(service, nullptr);
-  EXPECT_EQ(service->name(), "sshd");
-  EXPECT_EQ(service->displayName(), "ssh.service");
-  EXPECT_EQ(service->uniqueid(), idOf(900, 50));
-  EXPECT_EQ(service->responsibleUniqueid(), idOf(900, 50));
-  EXPECT_EQ(service->userTime(), 25 * 1000000000ull / static_cast<std::uint64_t>(sysconf(_SC_CLK_TCK)));
-  EXPECT_EQ(service->residentSize(), 2048u * 1024);
-  EXPECT_EQ(service->physFootprint(), 1040u * 1024);
-  EXPECT_EQ(service->pageins(), 7u);
-  EXPECT_EQ(service->uid(), 1000u);
-  EXPECT_EQ(service->procStartAbstime(), 50 * 1000 / static_cast<std::uint64_t>(sysconf(_SC_CLK_TCK)));
-  const ProcessUsage* user950 = find(records, 950, -1);
-  ASSERT_NE(user950, nullptr);
-  EXPECT_EQ(user950->parentUniqueid(), manager->uniqueid());
-  EXPECT_EQ(user950->responsibleUniqueid(), user950->uniqueid());
-
-  const ProcessUsage* fork = find(records, 902, -1);
-  ASSERT_NE(fork, nullptr);
-  EXPECT_EQ(fork->parentUniqueid(), idOf(900, 50));
-  EXPECT_EQ(fork->responsibleUniqueid(), idOf(900, 50));  // the oldest of its unit
-  EXPECT_EQ(fork->nowAbstime(), 5'010'000u);
-
-  const ProcessUsage* exit = find(records, 901, 0);
-  ASSERT_NE(exit, nullptr);
-  EXPECT_EQ(exit->name(), "sshd");
-  EXPECT_EQ(exit->uniqueid(), idOf(901, 60));
-  EXPECT_EQ(exit->procExitAbstime(), 5'020'000u);
-  EXPECT_EQ(exit->absoluteTime(), 5'020'000u);
+  const std::uint64_t tick = static_cast<std::uint64_t>(sysconf(_SC_CLK_TCK));
+  EXPECT_EQ(std::tuple(service->name(), service->displayName(), service->uniqueid(), service->responsibleUniqueid()),
+            std::tuple("sshd", "ssh.service", idOf(900, 50), idOf(900, 50)));
+  EXPECT_EQ(std::tuple(service->userTime(), service->residentSize(), service->physFootprint(), service->pageins(),
+                       service->uid(), service->procStartAbstime()),
+            std::tuple(25 * 1000000000ull / tick, 2048u * 1024, 1040u * 1024, 7u, 1000u, 50 * 1000 / tick));
+  EXPECT_EQ(std::pair(user950->parentUniqueid(), user950->responsibleUniqueid()),
+            std::pair(manager->uniqueid(), user950->uniqueid()));
+  // A fork counts under the oldest process of its unit.
+  EXPECT_EQ(std::tuple(fork->parentUniqueid(), fork->responsibleUniqueid(), fork->nowAbstime()),
+            std::tuple(idOf(900, 50), idOf(900, 50), 5'010'000u));
+  EXPECT_EQ(std::tuple(exit->name(), exit->uniqueid(), exit->procExitAbstime(), exit->absoluteTime()),
+            std::tuple("sshd", idOf(901, 60), 5'020'000u, 5'020'000u));
   EXPECT_EQ(find(records, 900, 0), nullptr);  // still running
 }
 

@@ -79,9 +79,8 @@ TEST(RecorderSources, EnergyOnlyBatteryInMilliampHours) {
   recorder::MachineFiles machine(tree.dir.path());
   const auto state = recorder::PowerSupplySource(machine).read();
   ASSERT_TRUE(state.battery);
-  EXPECT_EQ(state.battery->charge(), 4000);
-  EXPECT_EQ(state.battery->maxCharge(), 5000);
-  EXPECT_EQ(state.battery->instantAmperage(), -1000);
+  EXPECT_EQ(std::tuple(state.battery->charge(), state.battery->maxCharge(), state.battery->instantAmperage()),
+            std::tuple(4000, 5000, -1000));
   ASSERT_TRUE(state.external);  // no adapter: a discharging battery means battery power
   EXPECT_FALSE(*state.external);
 }
@@ -187,16 +186,11 @@ TEST(RecorderSources, CountersOfWholeDisksNetworksInterruptsAndMemory) {
   const auto memory = store.all<SystemMemory>();
   ASSERT_EQ(memory.size(), 1u);
   const std::uint64_t page = static_cast<std::uint64_t>(sysconf(_SC_PAGESIZE));
-  EXPECT_EQ(memory[0]->memorySize(), 8000000ull * 1024);
-  EXPECT_EQ(memory[0]->pageSize(), page);
-  EXPECT_EQ(memory[0]->freeCount(), 400000u * 1024 / page);
-  EXPECT_EQ(memory[0]->wiredCount(), 40000u * 1024 / page);
-  EXPECT_EQ(memory[0]->internalPageCount(), 120000u * 1024 / page);
-  EXPECT_EQ(memory[0]->pageins(), 8000u / (page / 1024));
-  EXPECT_EQ(memory[0]->swapouts(), 5u);
-  EXPECT_EQ(memory[0]->faults(), 123456u);
-  EXPECT_TRUE(memory[0]->hasSwapDeviceIsSsd());
-  EXPECT_TRUE(memory[0]->swapDeviceIsSsd());
+  const SystemMemory& m = *memory[0];
+  EXPECT_EQ(std::tuple(m.memorySize(), m.pageSize(), m.freeCount(), m.wiredCount(), m.internalPageCount()),
+            std::tuple(8000000ull * 1024, page, 400000u * 1024 / page, 40000u * 1024 / page, 120000u * 1024 / page));
+  EXPECT_EQ(std::tuple(m.pageins(), m.swapouts(), m.faults(), m.hasSwapDeviceIsSsd(), m.swapDeviceIsSsd()),
+            std::tuple(8000u / (page / 1024), 5u, 123456u, true, true));
 }
 
 }  // namespace

@@ -54,23 +54,19 @@ TEST(RecorderStatsLog, HeadersChainTheBootsAndMarkTheBootsFirstFile) {
   ASSERT_EQ(headers.size(), 2u);
   for (std::size_t i = 0; i < 2; ++i) {
     SCOPED_TRACE(i);
-    EXPECT_EQ(headers[i]->bootUUID(), kBoot);
-    EXPECT_EQ(headers[i]->lastBootUUID(), kPrevious);
-    EXPECT_EQ(headers[i]->systemVersion(), "6.1.0-18-amd64");
-    EXPECT_EQ(headers[i]->lastSystemVersion(), "6.1.0-17-amd64");
-    EXPECT_EQ(headers[i]->isFirst(), i == 0 ? 1u : 0u);
-    EXPECT_NE(headers[i]->writer(), 5u);  // several files per boot
-    EXPECT_EQ(headers[i]->absoluteTime(), 5'000'000u + 1000 * i);
-    EXPECT_EQ(headers[i]->wallTime(), 1'790'000'000'000u + 1000 * i);
+    const LogStartsV1& h = *headers[i];
+    EXPECT_EQ(std::tuple(*h.bootUUID(), *h.lastBootUUID(), h.systemVersion(), h.lastSystemVersion()),
+              std::tuple(kBoot, kPrevious, "6.1.0-18-amd64", "6.1.0-17-amd64"));
+    EXPECT_EQ(std::tuple(h.isFirst(), h.absoluteTime(), h.wallTime()),
+              std::tuple(i == 0 ? 1u : 0u, 5'000'000u + 1000 * i, 1'790'000'000'000u + 1000 * i));
+    EXPECT_NE(h.writer(), 5u);  // several files per boot
   }
   // Each header is followed by the zone.
   const auto zones = contents.all<TimeChange>();
   ASSERT_EQ(zones.size(), 2u);
   EXPECT_EQ(contents.records[1], zones[0]);
-  EXPECT_EQ(zones[0]->zoneName(), "CET");
-  EXPECT_EQ(zones[0]->gmtoff(), 3600);
-  EXPECT_EQ(zones[0]->yday(), 300);
-  EXPECT_EQ(zones[0]->year(), 2026);
+  EXPECT_EQ(std::tuple(zones[0]->zoneName(), zones[0]->gmtoff(), zones[0]->yday(), zones[0]->year()),
+            std::tuple("CET", 3600, 300, 2026));
 }
 
 TEST(RecorderStatsLog, RotatesAndAnnouncesClockZoneAndDateChanges) {
@@ -103,9 +99,8 @@ TEST(RecorderStatsLog, RotatesAndAnnouncesClockZoneAndDateChanges) {
   const auto date = contents.all<DateChange>();
   EXPECT_EQ(date[0]->newYday(), 301u);
   const auto times = contents.all<TimeChange>();
-  EXPECT_EQ(times[2]->reason(), StatsLog::kZoneChanged);
-  EXPECT_EQ(times[2]->zoneName(), "CEST");
-  EXPECT_EQ(times[2]->gmtoff(), 7200);
+  EXPECT_EQ(std::tuple(times[2]->reason(), times[2]->zoneName(), times[2]->gmtoff()),
+            std::tuple(StatsLog::kZoneChanged, "CEST", 7200));
   EXPECT_EQ(times[3]->reason(), StatsLog::kClockSet);
   EXPECT_EQ(times[3]->wallTime() - times[3]->absoluteTime(), 1'790'000'000'000u - 5'000'000u + 3'600'000u);
   EXPECT_EQ(log.wallAt(log.now()), clock.wall);

@@ -85,20 +85,6 @@ TEST_F(RequestHandling, BatteryGraphTakesADataEndUnderFiveSecondsAheadAsNow) {
   // Five seconds ahead ends the service: BusServiceTest runs it.
 }
 
-TEST_F(RequestHandling, BatteryGraphNeedsExactlyOneModelOfTheRunningBuild) {
-  test::writeBatteryStore(dir / "battery.stats", kCurrentBoot, "6.1.0-test", kWallStart);
-  test::writeBatteryStore(dir / "older.stats", kOtherBoot, "5.0.0-old", kWallStart - 10000000);
-  setNow(kWallStart + 200000);
-  for (std::optional<std::string> running : {std::optional<std::string>("7.0.0-none"), std::optional<std::string>()}) {
-    fake.systemVersion = running;  // no such build; unknown: both builds
-    test::thrown(
-        [&] {
-          request({{"request_type", "battery_charge_graph"}});
-        },
-        kInternalInconsistencyException, "multiple system versions detected");
-  }
-}
-
 class JobRequests : public RequestHandling {
  protected:
   JobRequests() {

@@ -108,18 +108,17 @@ TEST(CPUSummary, BadCountersLeaveTheirQuantityOut) {
   feed(s, PackageEnergyStatistics{}, 5 * kMinute);  // every field missing
   feed(s, PackageEnergyStatistics{}, 7 * kMinute);
 
-  const CPUSummary across = summarize(s, kMinute, 3 * kMinute);
-  EXPECT_EQ(across.avgCStateResidencyDenom(), 0);
+  const CPUSummary across = summarize(s, kMinute, 3 * kMinute);  // frequency 0 is left out too
+  EXPECT_EQ(std::tuple(across.avgCStateResidencyDenom(), across.avgInterruptRateNumer(), across.avgPkgFrequencyDenom()),
+            std::tuple(0.0, 81000.0, 0.0));
   EXPECT_FALSE(across.avgCStateResidencyBreakdown());
-  EXPECT_DOUBLE_EQ(across.avgInterruptRateNumer(), 81000);
-  EXPECT_EQ(across.avgPkgFrequencyDenom(), 0);  // frequency 0 is left out
   EXPECT_TRUE(std::isnan(cStateResidencyPercent(across)));
 
+  // Missing counters read as 0: residency 0, frequency left out.
   const CPUSummary empty = summarize(s, 5 * kMinute, 7 * kMinute);
-  EXPECT_EQ(empty.avgCStateResidencyNumer(), 0);  // missing counters read as 0: residency 0
-  EXPECT_EQ(empty.avgCStateResidencyDenom(), 2 * kMinute);
-  EXPECT_EQ(empty.avgPkgFrequencyDenom(), 0);  // and frequency left out
-  EXPECT_EQ(empty.nominalPkgFrequency(), 0);
+  EXPECT_EQ(std::tuple(empty.avgCStateResidencyNumer(), empty.avgCStateResidencyDenom(), empty.avgPkgFrequencyDenom(),
+                       empty.nominalPkgFrequency()),
+            std::tuple(0.0, 2.0 * kMinute, 0.0, 0.0));
 
   CPUSummarizer fresh;
   feed(fresh, pkg({.cany = 0}), kMinute);

@@ -44,16 +44,6 @@ TEST(Standby, SleepEndedByAWakeFromStandbyIsARangeAndCountsByWakeType) {
   EXPECT_EQ(summarize(s, {50, 10}).wakeTypes(), (Counts{{"RTC", 0}}));
 }
 
-TEST(Standby, OrdinaryWakeDropsTheSleepAndOtherRecordsAreIgnored) {
-  StandbySummarizer s;
-  feed(s, sleepWake(0, 0, 0), 10);
-  feed(s, test::device(5, 1), 20);
-  feed(s, sleepWake(0, 0, 1), 30);
-  feed(s, sleepWake(0, 0, 1, "RTC", true), 40);  // no sleep open: counted, no range
-  EXPECT_TRUE(s.ranges().empty());
-  EXPECT_EQ(summarize(s, {0, 100}).wakesFromStandby(), 1u);
-}
-
 // A fake /proc and /sys under a temporary root: a swap file whose file
 // system's device number links to the block device `node`.
 class SwapDiskLookup : public ::testing::Test {

@@ -61,19 +61,6 @@ struct WithProcesses : ModelUsageInputs {
   ProcessFigures processes;
 };
 
-TEST_F(Usage, TopJobsAreTheFiveHighestPowerScores) {
-  ProcessFigures p{12.5, {}};
-  for (int i = 1; i <= 7; ++i) p.jobs.push_back(JobUsage{"job" + std::to_string(i), i * 1.0, (i % 4) * 1e9});
-  const Dictionary result = UsageSummarizer::usageOfDay(day, WithProcesses(model, p));
-  EXPECT_EQ(result.at("CPUTime"), Value(12.5));
-  std::vector<std::string> labels;
-  for (const Value& job : result.at("TopJobs").get<Array>())
-    labels.push_back(job.get<Dictionary>().at("Label").get<std::string>());
-  EXPECT_EQ(labels, (std::vector<std::string>{"job3", "job7", "job2", "job6", "job1"}));
-  EXPECT_EQ(result.at("TopJobs").get<Array>()[0],
-            Value(Dictionary{{"Label", Value("job3")}, {"CPUTime", Value(3.0)}, {"PowerScore", Value(3e9)}}));
-}
-
 TEST_F(Usage, FileRoundTripsThroughAnXmlPropertyListDroppingOldDaysAndKeepingUnknownKeys) {
   Dictionary usage{
       {"Version", Value(2)},

@@ -375,13 +375,6 @@ TEST_F(TimeTest, ABootBeginsWithAVersionOneHeaderAndSortsByAbsoluteTimeKeepingTi
   EXPECT_EQ(order, (std::vector<const Record*>{first, early, late, last}));
 }
 
-TEST(AbsRange, SpansTwoTimesOfOneBootOnly) {
-  EXPECT_EQ(AbsRange::rangeWithBoot(kA, 7, 7).range(), (Range{7, 0}));  // equal ends: empty
-  test::thrown([&] { AbsRange::rangeWithBoot(kA, 10, 5); }, kInvalidArgumentException, "end < start");
-  const AbsTime a = AbsTime::timeWithBoot(kA, 100), b = AbsTime::timeWithBoot(kB, 100);
-  test::thrown([&] { AbsRange::rangeFromTime(&a, &b); }, kInvalidArgumentException, "start.boot != end.boot");
-}
-
 // The calendar reads the zone once, on first use: fix it before any test of
 // this binary runs.
 const bool kZoneSet = [] { return setenv("TZ", "America/New_York", 1) == 0 && (tzset(), true); }();
