@@ -36,14 +36,6 @@ TEST_F(ReportState, ValuesOfTheWrongTypeCountAsAbsentAndOtherKeysAreKept) {
   EXPECT_EQ(readPropertyList(stateFilePath())->get<Dictionary>().at("Keep"), Value(Array{1, 2}));
 }
 
-TEST_F(ReportState, AnUnwritableStateFileIsLoggedAndTheRunGoesOn) {
-  std::filesystem::remove_all(fake.ownStoreDirectory());
-  saveLastReportBuild("B2");
-  ASSERT_EQ(fake.assumptionLogLines.size(), 1u);
-  EXPECT_NE(fake.assumptionLogLines[0].find("state.plist"), std::string::npos);
-  EXPECT_FALSE(copyLastReportBuild());
-}
-
 // A child rewrites the file in a loop, alternating two contents, and is
 // killed at a random moment; the file must always hold one of them whole.
 TEST_F(ReportState, AKilledWriterLeavesTheOldOrTheNewFile) {

@@ -84,7 +84,6 @@ TEST_F(Terminal, EmptyResultsSayWhatWasAskedAndWhatTheDataCovers) {
     std::string note;
   } cases[] = {
       {{"-d", "20200101", "--show-events"}, "nothing to show: no records on 2020-01-01" + covers},
-      {{"-d", "20200101", "--dump"}, "nothing to show: no records on 2020-01-01" + covers},
       {{"-s", "2025-01-01 00:00:00", "--show-battery"},
        "nothing to show: no records from 2025-01-01 00:00:00 on" + covers},
       {{"-b", "99Z9", "--show-events"}, "nothing to show: no stats file is of build 99Z9\n"},

@@ -193,21 +193,6 @@ TEST_F(Telemetry, ADesktopStillSendsTheACAndWakeGroups) {
     EXPECT_EQ(key.rfind(kKey + "battery-", 0), std::string::npos) << key;
 }
 
-TEST(TelemetryFields, KeysAndValuesAreCutAndNumbersRounded) {
-  gDebug = 0;
-  TelemetryMessage m("d");
-  m.setField(std::string(40, 'p'), "name", std::string(200, 'v'));
-  m.setNumber("", "half", 2.5);
-  m.setNumber("", "negative", -0.4);
-  m.setNumber("", "nan", std::nan(""));
-  m.setNumber("", "half", 7);  // set again: replaced in place
-  ASSERT_EQ(m.fields().size(), 3u);
-  EXPECT_EQ(m.fields()[0].first, (kKey + std::string(40, 'p') + ".name").substr(0, 63));
-  EXPECT_EQ(m.fields()[0].second, std::string(127, 'v'));
-  EXPECT_EQ(m.fields()[1].second, "7");
-  EXPECT_EQ(m.fields()[2].second, "0");
-}
-
 TEST(TelemetryFields, JournalFieldsAreUpperCaseWithUnderscores) {
   EXPECT_EQ(journalFieldName("com.vexil.message.battery-wake.avg_power"), "COM_VEXIL_MESSAGE_BATTERY_WAKE_AVG_POWER");
   EXPECT_EQ(journalFieldName("com.vexil.message.device.wi-fi"), "COM_VEXIL_MESSAGE_DEVICE_WI_FI");

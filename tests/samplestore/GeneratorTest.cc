@@ -49,14 +49,5 @@ TEST(SampleStoreGenerator, SameSeedGivesTheSameFilesBytesAndTimesAnotherSeedDoes
   for (const auto& [path, content] : snapshot(dir / "c")) EXPECT_EQ(a.count(path), 0u) << path;
 }
 
-TEST(SampleStoreGenerator, RefusesToWriteIntoANonEmptyDirectory) {
-  bw::test::TempDir dir;
-  dir.write("store/var/db/brindlewick/old.stats", "x");
-  EXPECT_THROW(generateSampleStore(smallConfig(dir / "store", 1)), std::runtime_error);
-  EXPECT_EQ(snapshot(dir / "store").size(), 1u);
-  fs::create_directories(dir / "empty");
-  EXPECT_NO_THROW(generateSampleStore(smallConfig(dir / "empty", 1)));
-}
-
 }  // namespace
 }  // namespace bw::samplestore

@@ -3,14 +3,9 @@
 // own encoder. Both hold one boot of one build with a single segment (wall
 // time = wallStart + absolute time − 1000), so position = absolute time − 1000.
 //
-// Battery store (last record at position 94000):
-//   position  1000  battery 4000/5000 mAh (80 %)
-//             2000  on battery (PowerStateChange 1)
-//            61000  3900 mAh (78 %)
-//            69000  sleep (reason 0), 70000 wake (reason 1)
-//            80000  3800 mAh, 90000 3700 mAh (the second after the wake
-//                   extends the curve back to 70000)
-//            94000  on A/C and fully charged
+// Battery store (last record at position 94000): 80 % at 1000, on battery
+// from 2000, asleep from 69000 to 70000 (the second gauge sample after the
+// wake extends the curve back to it), on A/C and fully charged at 94000.
 // Job store (last record at position 49000): jobs from the table below,
 // each one process starting at absolute time 1500, sampled at 2000 with no
 // CPU time and at 50000 with its total (or at 40000 with its exit).

@@ -34,16 +34,14 @@ TEST(FanSummarizer, StateHoldsFromTheFirstAudibleSampleToTheFirstQuieterOne) {
 
   FanSummary summary;
   s.summarize(summary, AbsRange::rangeWithBoot(boot(1), 20, 50));
-  EXPECT_EQ(summary.samples(), 3u);
-  EXPECT_EQ(summary.quiet_or_off_samples(), 0u);
-  EXPECT_EQ(summary.audible_samples(), 1u);
-  EXPECT_EQ(summary.annoying_samples(), 1u);
-  EXPECT_EQ(summary.veryannoying_samples(), 1u);
+  const auto counts = [](const FanSummary& f) {
+    return std::tuple(f.samples(), f.quiet_or_off_samples(), f.audible_samples(), f.annoying_samples(),
+                      f.veryannoying_samples());
+  };
+  EXPECT_EQ(counts(summary), std::tuple(3u, 0u, 1u, 1u, 1u));
   s.summarize(summary, AbsRange::rangeWithBoot(boot(1), 0, 100));
   s.summarize(summary, AbsRange::rangeWithBoot(boot(3), 0, 100));  // never seen: time only
-  EXPECT_EQ(summary.samples(), 3u + 8u);
-  EXPECT_EQ(summary.quiet_or_off_samples(), 2u);
-  EXPECT_EQ(summary.veryannoying_samples(), 1u + 3u);
+  EXPECT_EQ(counts(summary), std::tuple(3u + 8u, 2u, 1u + 1u, 1u + 2u, 1u + 3u));
   EXPECT_EQ(summary.duration(), 230u);
 }
 

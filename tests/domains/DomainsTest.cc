@@ -1,9 +1,13 @@
+// The date and wall-time domains: bounds that follow the recorded zone, and
+// changes dated back to where the clock crossed a bound. The other domains are
+// reached through the run's options (RecordModesTest, DailyRunTest, the service).
 #include <gtest/gtest.h>
 
 #include <vector>
 
 #include "Support.h"
 #include "domains/DateDomain.h"
+#include "domains/WallTimeDomain.h"
 
 namespace bw {
 namespace {
@@ -11,6 +15,7 @@ namespace {
 using test::ConsoleCapture;
 using test::feed;
 using test::idle;
+using test::wakeAt;
 using test::zoneChange;
 using Ranges = std::vector<Range>;
 
@@ -45,6 +50,17 @@ TEST(DateDomain, AZoneChangeFromPlusOneToPlusTwoMovesBothBoundsAnHourEarlier) {
             "Selecting events from 2024-01-15\n"
             "Time zone change! Now zone is Africa/Lagos. Adjusting start/end to 1705273200000-1705359600000\n"
             "Time zone change! Now zone is Africa/Harare. Adjusting start/end to 1705269600000-1705356000000\n");
+}
+
+// Start 1,030,000 and end 1,100,000 ms of wall time; positions run 999,000
+// ms behind the wall clock, as on one segment.
+TEST(WallTimeDomain, DatesChangesBackToWhereTheClockCrossedTheBounds) {
+  WallTimeDomain domain(1'030'000, 1'100'000);
+  feed(domain, wakeAt(0), 1'000, 1'000'000);
+  feed(domain, wakeAt(0), 61'000, 1'060'000);   // start passed 30 s before
+  feed(domain, wakeAt(0), 161'000, 1'160'000);  // end passed 60 s before
+  EXPECT_EQ(domain.ranges(), (Ranges{{31'000, 70'000}}));
+  EXPECT_EQ(domain.lastTime(), 161'000u);
 }
 
 }  // namespace
