@@ -53,6 +53,9 @@ TEST_F(CommandLine, UsageErrorsPrintTheComplaintThenTheUsageAndExit64) {
   ToolResult retired = run({"-p"});  // errno is still 0 at that point
   EXPECT_EQ(retired.status, 64);
   EXPECT_EQ(retired.err, "brindlewick: The -p option is no longer supported: Success\n");
+  ToolResult daily = run({"--debug", "--daily", "-d", "20240210", "--from", store.path()});  // --debug: from a shell
+  EXPECT_EQ(daily.status, 64);
+  EXPECT_EQ(daily.err, "brindlewick: --daily mode should not have a specified domain\n");
 }
 
 TEST_F(CommandLine, StartIsReadInTheProcesssTimeZone) {
