@@ -2,11 +2,13 @@
 
 #include <cstdio>
 #include <cstdlib>
+#include <functional>
 #include <limits>
 #include <optional>
 
 #include "Records/BatteryChargeLevel.h"
 #include "Records/PowerStateChange.h"
+#include "Records/RecordDecoder.h"
 #include "Records/SleepWake.h"
 #include "base/Console.h"
 #include "base/DecimalText.h"
@@ -89,20 +91,31 @@ void plotLine(std::ostream& o, std::uint64_t position, double value) {
   o << format("%llu\t%.03g\n", static_cast<unsigned long long>(position / 1000), value);
 }
 
+// Walks the timeline's records, decoding only those of class `c` for
+// `block`; `each` sees every record's position first.
+void walkClass(const Timeline& timeline, RecordClass c, const std::function<void(std::uint64_t)>& each,
+               const std::function<void(const Record&, std::uint64_t)>& block) {
+  WalkDecoder decode;
+  timeline.enumerateRecordsUsingBlock(
+      [&](const RecordRef& record, std::uint64_t position, std::uint64_t, const AbsTime&, bool&) {
+        if (each) each(position);
+        if (record.recordClass() == c) block(decode(record), position);
+      });
+}
+
 void plotModel(const Model& model) {
   std::ostream& o = out();
   const Timeline& timeline = model.timeline();
   std::uint64_t first = std::numeric_limits<std::uint64_t>::max();
   std::uint64_t last = 0;
-  timeline.enumerateEventsUsingBlock(
-      [&](const Record& event, std::uint64_t position, std::uint64_t, const AbsTime&, bool&) {
-        first = std::min(first, position);
-        last = std::max(last, position);
-        if (event.recordClass() == RecordClass::BatteryChargeLevel) {
-          const auto& level = static_cast<const BatteryChargeLevel&>(event);
-          plotLine(o, position, static_cast<double>(level.charge()) * 100 / static_cast<double>(level.maxCharge()));
-        }
-      });
+  const auto extremes = [&](std::uint64_t position) {
+    first = std::min(first, position);
+    last = std::max(last, position);
+  };
+  walkClass(timeline, RecordClass::BatteryChargeLevel, extremes, [&](const Record& event, std::uint64_t position) {
+    const auto& level = static_cast<const BatteryChargeLevel&>(event);
+    plotLine(o, position, static_cast<double>(level.charge()) * 100 / static_cast<double>(level.maxCharge()));
+  });
 
   o << '\n';
   const auto* battery = dynamic_cast<const BatterySummarizer*>(model.summarizer("Power"));
@@ -114,32 +127,28 @@ void plotModel(const Model& model) {
   }
 
   o << '\n';
-  timeline.enumerateEventsUsingBlock(
-      [&](const Record& event, std::uint64_t position, std::uint64_t, const AbsTime&, bool&) {
-        if (event.recordClass() != RecordClass::SleepWake) return;
-        switch (static_cast<const SleepWake&>(event).reason()) {
-          case SleepWake::kSleep:
-            plotLine(o, position, 100);
-            break;
-          case SleepWake::kDarkWake:
-            plotLine(o, position, 50);
-            break;
-          case SleepWake::kWake:
-            plotLine(o, position, 0);
-            break;
-          default:
-            // Any other reason means the plot's assumptions are wrong: stop hard.
-            o.flush();
-            std::fprintf(stderr, "brindlewick: unexpected sleep/wake reason %u\n",
-                         static_cast<const SleepWake&>(event).reason());
-            std::abort();
-        }
-      });
+  walkClass(timeline, RecordClass::SleepWake, nullptr, [&](const Record& event, std::uint64_t position) {
+    switch (static_cast<const SleepWake&>(event).reason()) {
+      case SleepWake::kSleep:
+        plotLine(o, position, 100);
+        break;
+      case SleepWake::kDarkWake:
+        plotLine(o, position, 50);
+        break;
+      case SleepWake::kWake:
+        plotLine(o, position, 0);
+        break;
+      default:
+        // Any other reason means the plot's assumptions are wrong: stop hard.
+        o.flush();
+        std::fprintf(stderr, "brindlewick: unexpected sleep/wake reason %u\n",
+                     static_cast<const SleepWake&>(event).reason());
+        std::abort();
+    }
+  });
 
   o << '\n';
-  timeline.enumerateEventsUsingBlock([&](const Record& event, std::uint64_t position, std::uint64_t, const AbsTime&,
-                                         bool&) {
-    if (event.recordClass() != RecordClass::PowerStateChange) return;
+  walkClass(timeline, RecordClass::PowerStateChange, nullptr, [&](const Record& event, std::uint64_t position) {
     plotLine(o, position, static_cast<const PowerStateChange&>(event).change() != PowerStateChange::kOnAC ? 0 : 100);
   });
 }

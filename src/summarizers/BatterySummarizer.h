@@ -30,6 +30,10 @@ class BatterySummarizer : public Summarizer {
   // Takes BatteryChargeLevel, PowerStateChange, SleepWake and LogStartsV1
   // records, by position.
   void addEvent(const Record& event, std::uint64_t position, const AbsTime& absTime, std::uint64_t wallTime) override;
+  RecordClassSet classesRead() const override {
+    return recordClasses({RecordClass::BatteryChargeLevel, RecordClass::PowerStateChange, RecordClass::SleepWake,
+                          RecordClass::LogStartsV1});
+  }
   std::unique_ptr<Summary> newSummary() const override { return std::make_unique<PowerSummary>(); }
   // By average power, descending, equal within the double epsilon.
   SummaryComparator comparator() const override { return &compareAveragePower; }
