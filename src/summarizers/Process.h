@@ -6,8 +6,8 @@
 // `interrupts` and `pageins` are cumulative counts; `residentSize` and
 // `wired` are levels in bytes.
 //
-// Memory: a store holds tens of thousands of processes and close to a
-// million samples, so a process is its packed samples (ProcessSamples) plus
+// Memory: a store holds tens of thousands of processes and millions of
+// samples, so a process is its packed samples (ProcessSamples) plus
 // a few scalars. Label and display name are shared texts
 // (see JobNames); `stats` is made only when written; the boot is kept once
 // for both times. Jobs add the curves to their aggregates through aliasing

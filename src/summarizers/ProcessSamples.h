@@ -4,11 +4,11 @@
 // in an Interpolator (truncated toward zero, negatives as 0), and every
 // curve answers exactly what an Interpolator holding its samples would.
 //
-// Memory: a store holds close to a million process samples, so rows that
+// Memory: a month of records holds millions of process samples, so rows that
 // come in position order are packed: a byte saying which curves are present,
 // then varints of the change of the position and of each present value
 // (zigzag, so that levels may fall). Every 16 rows a checkpoint keeps the
-// decoding state, so a lookup walks about 16 rows. A row that comes
+// decoding state, so a lookup walks at most about 16 rows. A row that comes
 // out of order unpacks the curves into plain interpolators, which insert it
 // in place, and the process stays unpacked.
 #include <array>
