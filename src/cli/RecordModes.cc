@@ -2,7 +2,6 @@
 
 #include <cstdio>
 #include <cstdlib>
-#include <functional>
 #include <limits>
 #include <optional>
 
@@ -91,14 +90,13 @@ void plotLine(std::ostream& o, std::uint64_t position, double value) {
   o << format("%llu\t%.03g\n", static_cast<unsigned long long>(position / 1000), value);
 }
 
-// Walks the timeline's records, decoding only those of class `c` for
-// `block`; `each` sees every record's position first.
-void walkClass(const Timeline& timeline, RecordClass c, const std::function<void(std::uint64_t)>& each,
-               const std::function<void(const Record&, std::uint64_t)>& block) {
+// Calls `block` with each record of class `c`, passing over the others
+// undecoded.
+template <class Block>
+void forEachOfClass(const Timeline& timeline, RecordClass c, Block block) {
   WalkDecoder decode;
   timeline.enumerateRecordsUsingBlock(
       [&](const RecordRef& record, std::uint64_t position, std::uint64_t, const AbsTime&, bool&) {
-        if (each) each(position);
         if (record.recordClass() == c) block(decode(record), position);
       });
 }
@@ -108,14 +106,15 @@ void plotModel(const Model& model) {
   const Timeline& timeline = model.timeline();
   std::uint64_t first = std::numeric_limits<std::uint64_t>::max();
   std::uint64_t last = 0;
-  const auto extremes = [&](std::uint64_t position) {
-    first = std::min(first, position);
-    last = std::max(last, position);
-  };
-  walkClass(timeline, RecordClass::BatteryChargeLevel, extremes, [&](const Record& event, std::uint64_t position) {
-    const auto& level = static_cast<const BatteryChargeLevel&>(event);
-    plotLine(o, position, static_cast<double>(level.charge()) * 100 / static_cast<double>(level.maxCharge()));
-  });
+  WalkDecoder decode;
+  timeline.enumerateRecordsUsingBlock(
+      [&](const RecordRef& record, std::uint64_t position, std::uint64_t, const AbsTime&, bool&) {
+        first = std::min(first, position);
+        last = std::max(last, position);
+        if (record.recordClass() != RecordClass::BatteryChargeLevel) return;
+        const auto& level = static_cast<const BatteryChargeLevel&>(decode(record));
+        plotLine(o, position, static_cast<double>(level.charge()) * 100 / static_cast<double>(level.maxCharge()));
+      });
 
   o << '\n';
   const auto* battery = dynamic_cast<const BatterySummarizer*>(model.summarizer("Power"));
@@ -127,7 +126,7 @@ void plotModel(const Model& model) {
   }
 
   o << '\n';
-  walkClass(timeline, RecordClass::SleepWake, nullptr, [&](const Record& event, std::uint64_t position) {
+  forEachOfClass(timeline, RecordClass::SleepWake, [&](const Record& event, std::uint64_t position) {
     switch (static_cast<const SleepWake&>(event).reason()) {
       case SleepWake::kSleep:
         plotLine(o, position, 100);
@@ -148,7 +147,7 @@ void plotModel(const Model& model) {
   });
 
   o << '\n';
-  walkClass(timeline, RecordClass::PowerStateChange, nullptr, [&](const Record& event, std::uint64_t position) {
+  forEachOfClass(timeline, RecordClass::PowerStateChange, [&](const Record& event, std::uint64_t position) {
     plotLine(o, position, static_cast<const PowerStateChange&>(event).change() != PowerStateChange::kOnAC ? 0 : 100);
   });
 }

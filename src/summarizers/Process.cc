@@ -16,12 +16,6 @@ Process::Process()
               ProcessCurve(samples_, kInterrupts),   ProcessCurve(samples_, kPageins),
               ProcessCurve(samples_, kResidentSize), ProcessCurve(samples_, kWired)} {}
 
-void Process::addSample(CurveIndex curve, double value, std::uint64_t position) {
-  Row row{};
-  row[curve] = value;
-  samples_.addRow(position, 1u << curve, row);
-}
-
 Value Process::objectForKeyedSubscript(const std::string& key) const {
   if (!stats_) return Value();
   auto it = stats_->find(key);

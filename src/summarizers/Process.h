@@ -99,8 +99,6 @@ class Process {
   // Adds one sample row at `position`: `row[c]` for each curve c whose bit
   // (1 << c) is set in `present`.
   void addSamples(std::uint64_t position, unsigned present, const Row& row) { samples_.addRow(position, present, row); }
-  // Adds one sample to one curve.
-  void addSample(CurveIndex curve, double value, std::uint64_t position);
 
   const ProcessCurve& curve(CurveIndex c) const { return curves_[c]; }
   const ProcessCurve& cpuTime() const { return curves_[kCpuTime]; }

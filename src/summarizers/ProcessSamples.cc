@@ -1,5 +1,8 @@
 #include "summarizers/ProcessSamples.h"
 
+#include <google/protobuf/io/coded_stream.h>
+#include <google/protobuf/wire_format_lite.h>
+
 #include <algorithm>
 #include <cmath>
 #include <limits>
@@ -12,15 +15,16 @@ namespace {
 constexpr std::uint32_t kRowsPerCheckpoint = 16;
 constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
 
+using google::protobuf::internal::WireFormatLite;
+
 void putVarint(std::vector<std::uint8_t>& bytes, std::uint64_t v) {
-  while (v >= 0x80) {
-    bytes.push_back(static_cast<std::uint8_t>(v | 0x80));
-    v >>= 7;
-  }
-  bytes.push_back(static_cast<std::uint8_t>(v));
+  std::uint8_t buffer[10];
+  const std::uint8_t* end = google::protobuf::io::CodedOutputStream::WriteVarint64ToArray(v, buffer);
+  bytes.insert(bytes.end(), static_cast<const std::uint8_t*>(buffer), end);
 }
 
-// Only bytes this class wrote are read, so every varint is complete.
+// Only bytes this class wrote are read, so every varint is complete; the
+// library's readers want a stream object, too heavy for a lookup's walk.
 std::uint64_t getVarint(const std::uint8_t*& p) {
   std::uint64_t v = 0;
   for (unsigned shift = 0;; shift += 7) {
@@ -30,12 +34,31 @@ std::uint64_t getVarint(const std::uint8_t*& p) {
   }
 }
 
-// A change of value, modulo 2^64, as a small number either way.
-std::uint64_t zigzag(std::uint64_t change) {
-  const auto s = static_cast<std::int64_t>(change);
-  return (change << 1) ^ static_cast<std::uint64_t>(s >> 63);
-}
-std::uint64_t unzigzag(std::uint64_t z) { return (z >> 1) ^ (0 - (z & 1)); }
+// Walks the rows for one curve, skipping the other curves' values. A value
+// is stored as its change from the curve's previous one, modulo 2^64,
+// zigzagged so that a fall is as short as a rise.
+struct CurveCursor {
+  const std::uint8_t* p;
+  std::uint64_t rowPosition;
+  std::uint64_t value;  // the curve's last value so far
+  unsigned bit;
+
+  // Steps over one row; answers whether it holds the curve.
+  bool step() {
+    const unsigned present = *p++;
+    rowPosition += getVarint(p);
+    for (unsigned b = 1; b <= present; b <<= 1) {
+      if (!(present & b)) continue;
+      if (b == bit) {
+        value += static_cast<std::uint64_t>(WireFormatLite::ZigZagDecode64(getVarint(p)));
+      } else {
+        while (*p++ & 0x80) {
+        }
+      }
+    }
+    return (present & bit) != 0;
+  }
+};
 
 }  // namespace
 
@@ -56,26 +79,12 @@ void ProcessSamples::addRow(std::uint64_t position, unsigned present, const std:
   for (std::size_t c = 0; c < kCurves; ++c) {
     if (!(present & (1u << c))) continue;
     const std::uint64_t value = truncateToUnsigned(values[c]);
-    putVarint(bytes_, zigzag(value - end_.last[c].value));
+    putVarint(bytes_, WireFormatLite::ZigZagEncode64(static_cast<std::int64_t>(value - end_.last[c].value)));
     end_.last[c] = Last{position, value};
     end_.seen = static_cast<std::uint8_t>(end_.seen | (1u << c));
-    ++counts_[c];
   }
   ++rows_;
   end_.offset = static_cast<std::uint32_t>(bytes_.size());
-}
-
-std::uint64_t ProcessSamples::decodeRow(State& state, unsigned& present) const {
-  const std::uint8_t* p = bytes_.data() + state.offset;
-  present = *p++;
-  state.rowPosition += getVarint(p);
-  for (std::size_t c = 0; c < kCurves; ++c) {
-    if (!(present & (1u << c))) continue;
-    state.last[c] = Last{state.rowPosition, state.last[c].value + unzigzag(getVarint(p))};
-    state.seen = static_cast<std::uint8_t>(state.seen | (1u << c));
-  }
-  state.offset = static_cast<std::uint32_t>(p - bytes_.data());
-  return state.rowPosition;
 }
 
 // Rows are in position order, so every row before a checkpoint whose row
@@ -87,42 +96,14 @@ const ProcessSamples::State& ProcessSamples::startBefore(std::uint64_t position)
   return it == checkpoints_.begin() ? kFirstRow : std::prev(it)->state;
 }
 
-namespace {
-
-// Walks the rows for one curve, skipping the other curves' values.
-struct CurveCursor {
-  const std::uint8_t* p;
-  std::uint64_t rowPosition;
-  std::uint64_t value;  // the curve's last value so far
-  unsigned bit;
-
-  // Steps over one row; answers whether it holds the curve.
-  bool step() {
-    const unsigned present = *p++;
-    rowPosition += getVarint(p);
-    for (unsigned b = 1; b <= present; b <<= 1) {
-      if (!(present & b)) continue;
-      if (b == bit) {
-        value += unzigzag(getVarint(p));
-      } else {
-        while (*p++ & 0x80) {
-        }
-      }
-    }
-    return (present & bit) != 0;
-  }
-};
-
-}  // namespace
-
 double ProcessSamples::valueAtPosition(std::size_t curve, std::uint64_t position) const {
   if (loose_) return (*loose_)[curve].valueAtPosition(position);
-  if (counts_[curve] == 0) return kNaN;
+  const unsigned bit = 1u << curve;
+  if (!(end_.seen & bit)) return kNaN;
   const auto point = [](const Last& l) { return DataPoint{l.position, static_cast<double>(l.value)}; };
   const Last& last = end_.last[curve];
   // Past every sample of the curve (a process asked about after it ended).
   if (position > last.position) return point(last).value;
-  const unsigned bit = 1u << curve;
   const State& start = startBefore(position);
   CurveCursor cursor{bytes_.data() + start.offset, start.rowPosition, start.last[curve].value, bit};
   bool hasBefore = (start.seen & bit) != 0;
@@ -143,10 +124,9 @@ double ProcessSamples::maxValueInRange(std::size_t curve, Range range) const {
   if (loose_) return (*loose_)[curve].maxValueInRange(range);
   const std::uint64_t begin = range.location, end = range.location + range.length;
   double result = kNaN;
-  if (end < begin || counts_[curve] == 0) return result;
-  const std::uint64_t lastSample = end_.last[curve].position;
-  if (begin > lastSample) return result;
   const unsigned bit = 1u << curve;
+  const std::uint64_t lastSample = end_.last[curve].position;
+  if (end < begin || !(end_.seen & bit) || begin > lastSample) return result;
   const State& start = startBefore(begin);
   CurveCursor cursor{bytes_.data() + start.offset, start.rowPosition, start.last[curve].value, bit};
   const std::uint8_t* const rowsEnd = bytes_.data() + end_.offset;
@@ -160,8 +140,13 @@ double ProcessSamples::maxValueInRange(std::size_t curve, Range range) const {
   return result;
 }
 
+// Counted by walking the rows: only tests and benchmarks ask.
 std::size_t ProcessSamples::count(std::size_t curve) const {
-  return loose_ ? (*loose_)[curve].dataSet().count() : counts_[curve];
+  if (loose_) return (*loose_)[curve].dataSet().count();
+  std::size_t n = 0;
+  CurveCursor cursor{bytes_.data(), 0, 0, 1u << curve};
+  while (cursor.p < bytes_.data() + end_.offset) n += cursor.step() ? 1 : 0;
+  return n;
 }
 
 void ProcessSamples::shrinkToFit() {
@@ -173,16 +158,14 @@ void ProcessSamples::shrinkToFit() {
   checkpoints_.shrink_to_fit();
 }
 
-// Replays the packed rows into plain interpolators; a stored whole number
-// reads back as itself.
+// Replays the packed rows into plain interpolators, one curve at a time; a
+// stored whole number reads back as itself.
 void ProcessSamples::unpack() {
   loose_ = std::make_unique<std::array<Interpolator, kCurves>>();
-  State s;
-  while (s.offset < end_.offset) {
-    unsigned present = 0;
-    const std::uint64_t at = decodeRow(s, present);
-    for (std::size_t c = 0; c < kCurves; ++c) {
-      if (present & (1u << c)) (*loose_)[c].addValue(static_cast<double>(s.last[c].value), at);
+  for (std::size_t c = 0; c < kCurves; ++c) {
+    CurveCursor cursor{bytes_.data(), 0, 0, 1u << c};
+    while (cursor.p < bytes_.data() + end_.offset) {
+      if (cursor.step()) (*loose_)[c].addValue(static_cast<double>(cursor.value), cursor.rowPosition);
     }
   }
   bytes_ = {};

@@ -60,9 +60,6 @@ class ProcessSamples {
     std::uint64_t position = 0;  // of the row it stands before
     State state;
   };
-  // Decodes the row at `state` into it and answers its position and which
-  // curves it holds.
-  std::uint64_t decodeRow(State& state, unsigned& present) const;
   // The state before the first row that may lie at or after `position`.
   const State& startBefore(std::uint64_t position) const;
   void unpack();
@@ -71,7 +68,6 @@ class ProcessSamples {
   std::vector<Checkpoint> checkpoints_;
   State end_;  // after the last row
   std::uint32_t rows_ = 0;
-  std::array<std::uint32_t, kCurves> counts_{};
   std::unique_ptr<std::array<Interpolator, kCurves>> loose_;
 };
 

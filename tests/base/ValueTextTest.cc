@@ -36,33 +36,26 @@ TEST(ValueText, StringsAreQuotedOnlyWhenTheyHoldOtherCharacters) {
   EXPECT_EQ(describeValue(Value("say \"hi\"\n")), "\"say \\\"hi\\\"\\n\"");
 }
 
-// The hot text writers' integers print as printf prints them.
+// The hot text writers' integers print as printf prints them (the space
+// flag means nothing to an unsigned conversion).
 TEST(DecimalText, MatchesPrintfForEveryWidthAndFlag) {
-  char expected[64];
+  const auto check = [](auto v, int width, const char* spaces, const char* zeros, const char* sign) {
+    char expected[64];
+    const struct {
+      DecimalPad pad;
+      const char* format;
+    } rows[] = {{DecimalPad::kSpaces, spaces}, {DecimalPad::kZeros, zeros}, {DecimalPad::kSignSpace, sign}};
+    for (const auto& row : rows) {
+      std::string text;
+      appendDecimal(text, v, width, row.pad);
+      std::snprintf(expected, sizeof expected, row.format, width, v);
+      EXPECT_EQ(text, expected) << row.format << " " << width;
+    }
+  };
   for (int width : {0, 1, 2, 5, 8, 25, 60}) {
-    for (long long v : {0LL, 7LL, -7LL, 42LL, -42LL, 123456789LL, LLONG_MIN, LLONG_MAX}) {
-      std::string spaces, zeros, sign;
-      appendDecimal(spaces, v, width);
-      appendDecimal(zeros, v, width, DecimalPad::kZeros);
-      appendDecimal(sign, v, width, DecimalPad::kSignSpace);
-      std::snprintf(expected, sizeof expected, "%*lld", width, v);
-      EXPECT_EQ(spaces, expected);
-      std::snprintf(expected, sizeof expected, "%0*lld", width, v);
-      EXPECT_EQ(zeros, expected);
-      std::snprintf(expected, sizeof expected, "% *lld", width, v);
-      EXPECT_EQ(sign, expected);
-    }
-    for (unsigned long long v : {0ULL, 42ULL, ULLONG_MAX}) {
-      std::string spaces, zeros, sign;
-      appendDecimal(spaces, v, width);
-      appendDecimal(zeros, v, width, DecimalPad::kZeros);
-      appendDecimal(sign, v, width, DecimalPad::kSignSpace);
-      std::snprintf(expected, sizeof expected, "%*llu", width, v);
-      EXPECT_EQ(spaces, expected);
-      EXPECT_EQ(sign, expected);
-      std::snprintf(expected, sizeof expected, "%0*llu", width, v);
-      EXPECT_EQ(zeros, expected);
-    }
+    for (long long v : {0LL, 7LL, -7LL, 42LL, -42LL, 123456789LL, LLONG_MIN, LLONG_MAX})
+      check(v, width, "%*lld", "%0*lld", "% *lld");
+    for (unsigned long long v : {0ULL, 42ULL, ULLONG_MAX}) check(v, width, "%*llu", "%0*llu", "%*llu");
   }
   EXPECT_EQ(durationText(-4000), "00:00:-4");
 }
